@@ -1,0 +1,15 @@
+// Is there a finger? Chooses the detector behind vmk_fp_navigation_detect_finger_status and keeps
+// its answer in s_lastFrameFlag. Owns nothing.
+#ifndef FPNAVI_FINGERSTATUS_H
+#define FPNAVI_FINGERSTATUS_H
+
+#include <cstdint>
+
+namespace fpnavi {
+
+// Coverage, in percent, of a double-scan map: 64 cells, those exactly 1 count.
+int32_t DoubleScanFingerDetect(const uint8_t* DoubleScanZone);
+
+}  // namespace fpnavi
+
+#endif  // FPNAVI_FINGERSTATUS_H

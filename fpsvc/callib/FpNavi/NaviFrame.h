@@ -1,0 +1,41 @@
+// The navigation frame: its buffers and the three operations on it. Owns the four frames of a
+// gesture. Besides this room, pre-processing writes class map, greys and range of s_imageCurr, the
+// centroid method its cvr, xc, yc (and those of s_imagePrev), and FullImage fills the full images.
+#ifndef FPNAVI_NAVIFRAME_H
+#define FPNAVI_NAVIFRAME_H
+
+#include <cstdint>
+
+#include "FpNavi.h"
+
+namespace fpnavi {
+
+extern NaviFrame_t s_imageCurr;      // the frame just received
+extern NaviFrame_t s_imagePrev;      // the accepted frame before it
+extern NaviFrame_t s_fullImageCurr;  // s_imageCurr with its tiles spread apart
+extern NaviFrame_t s_fullImagePrev;  // s_imagePrev with its tiles spread apart
+
+// Fills img with rows i_start..i_end - 1 and columns j_start..j_end - 1 of data, an image of
+// s_imageHeight rows of s_imageWidth bytes; class map and measures become 0. Returns 0; -1 for a
+// null pointer or a window that is empty or not inside the image (img stays as it is) or for a
+// failed allocation (img keeps its sizes but has no buffers).
+int32_t ImgInit(NaviFrame_t* img, int32_t i_start, int32_t i_end, int32_t j_start, int32_t j_end,
+                const uint8_t* data);
+
+// Frees the buffers of img and zeroes it. A null img is left alone.
+void ImgClear(NaviFrame_t* img);
+
+// Makes img_dst an independent copy of img_src. Returns 0; -1 when the source is empty (img_dst
+// stays as it is) or an allocation failed (img_dst has the new sizes but no buffers).
+int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src);
+
+// Replaces both buffers of img by fresh ones of size bytes each, all 0. Returns false, with both
+// pointers null, when an allocation fails; sizes and measures are the caller's to set.
+bool ReplaceBuffers(NaviFrame_t* img, int32_t size);
+
+// img has both buffers and at least one pixel.
+bool HasPixels(const NaviFrame_t* img);
+
+}  // namespace fpnavi
+
+#endif  // FPNAVI_NAVIFRAME_H
