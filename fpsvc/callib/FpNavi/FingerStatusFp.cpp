@@ -91,6 +91,8 @@ int32_t GetGreyRange(const uint8_t* buffer, int32_t* range) {
 }
 
 int32_t NavFingerDetectFp(const uint8_t* p_data) {
+    if (p_data == nullptr)
+        return -1;
     const int32_t blockNum = 5;
     // A block that the texture test leaves unwritten has no texture and a white mean.
     int32_t fftRes[2 * blockNum] = {0, 0, 0, 0, 0, 255, 255, 255, 255, 255};

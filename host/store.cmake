@@ -1,0 +1,16 @@
+# Recordings, their store, the importers and the parameter files.
+set(FPNAVI_STORE_SOURCES
+        Error.cpp
+        Files.cpp
+        FngImport.cpp
+        FngIndex.cpp
+        Keys.cpp
+        ParamFile.cpp
+        ParamTable.cpp
+        RawImport.cpp
+        Redact.cpp
+        Sqlite.cpp
+        StoreCheck.cpp
+        StoreRead.cpp
+        StoreSchema.cpp
+        StoreWrite.cpp)
