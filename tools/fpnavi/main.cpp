@@ -14,6 +14,7 @@ constexpr const char* kFooter = R"(Examples:
   fpnavi replay corpus.db
   fpnavi replay corpus.db --gesture s_fp_tiled_000
   fpnavi params --mode hg
+  fpnavi tune --seed 1
 
 Exit codes: 0 fine, 1 wrong keys found, 2 usage, 3 bad input or output.
 Recordings hold pictures of fingerprints: store and share them as biometric data.)";
