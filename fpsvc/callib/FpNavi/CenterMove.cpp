@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "BitRows.h"
 #include "NaviFrame.h"
 #include "NaviMath.h"
 #include "NaviParam.h"
@@ -22,27 +23,57 @@ bool IsDeformation(int32_t dcvr, int32_t way) {
     return WrapAbs(deform_rate) > s_deformThreshold;
 }
 
+// The finger's pixels, counted, and the sums of their centres in hundredths of a pixel.
+struct FingerSums {
+    int64_t cnt;
+    int64_t x;
+    int64_t y;
+};
+
+FingerSums SumBytes(const NaviFrame_t& img) {
+    FingerSums sums = {0, 0, 0};
+    for (int32_t row = 0; row < img.height; ++row) {
+        for (int32_t column = 0; column < img.width; ++column) {
+            if (img.pType[row * img.width + column] != 1)
+                continue;
+            ++sums.cnt;
+            sums.x += 100 * column + 50;
+            sums.y += 100 * row + 50;
+        }
+    }
+    return sums;
+}
+
+// The same for up to 64 rows of up to 64 pixels: counts of rows come from words, counts of columns
+// from bytes, and all fit 32 bits.
+FingerSums SumWords(const NaviFrame_t& img) {
+    uint8_t inColumn[kWordPixels] = {};
+    int32_t cnt = 0;
+    int32_t y = 0;
+    for (int32_t row = 0; row < img.height; ++row) {
+        const uint8_t* const type = img.pType + row * img.width;
+        const int32_t inRow = CountBits(EqualBits(type, img.width, 1));
+        cnt += inRow;
+        y += inRow * (100 * row + 50);
+        for (int32_t column = 0; column < img.width; ++column)
+            inColumn[column] = static_cast<uint8_t>(inColumn[column] + (type[column] == 1));
+    }
+    int32_t x = 0;
+    for (int32_t column = 0; column < img.width; ++column)
+        x += inColumn[column] * (100 * column + 50);
+    return {cnt, x, y};
+}
+
 }  // namespace
 
 int32_t GetCenterAndCoverage(NaviFrame_t* img) {
     if (!HasPixels(img))
         return -1;
-    int64_t cnt = 0;
-    int64_t x = 0;  // sums of pixel centres in hundredths of a pixel
-    int64_t y = 0;
-    for (int32_t row = 0; row < img->height; ++row) {
-        for (int32_t column = 0; column < img->width; ++column) {
-            if (img->pType[row * img->width + column] != 1)
-                continue;
-            ++cnt;
-            x += 100 * column + 50;
-            y += 100 * row + 50;
-        }
-    }
+    const FingerSums sums = FitsWords(img->width, img->height) ? SumWords(*img) : SumBytes(*img);
     const int64_t size = int64_t{img->width} * img->height;
-    img->xc = cnt == 0 ? 0 : static_cast<int32_t>(x / (img->width * cnt) - 50);
-    img->yc = cnt == 0 ? 0 : static_cast<int32_t>(50 - y / (img->height * cnt));
-    img->cvr = static_cast<int32_t>(100 * cnt / size);
+    img->xc = sums.cnt == 0 ? 0 : static_cast<int32_t>(sums.x / (img->width * sums.cnt) - 50);
+    img->yc = sums.cnt == 0 ? 0 : static_cast<int32_t>(50 - sums.y / (img->height * sums.cnt));
+    img->cvr = static_cast<int32_t>(100 * sums.cnt / size);
     return 0;
 }
 

@@ -5,12 +5,20 @@
 
 #include <cstdint>
 
+#include "PlacementDiffs.h"
+#include "Templates.h"
+
 namespace fpnavi {
 
 // Sinks arr[i] until no child is larger; of equal children the left one rises, a parent never
 // yields to an equal. arr: len keys, the caller's. Returns 0 (also for i >= len), or -1 for a null
 // arr or len < 1.
 int32_t MaxHeapify(uint32_t* arr, int32_t len, int32_t i);
+
+// Fills candidateList (s_candidateNum keys, the caller's) with the best keys of all placements, as
+// a heap: offered template by template, row by row, they take an order that decides between equals.
+// tables: what TabulatePlacements gives for set, or null to score the placements one by one.
+void RankCandidates(const TemplateSet& set, const PlacementDiffs* tables, uint32_t* candidateList);
 
 // Fills both arrays (s_candidateNum entries, the caller's) with the displacements, rows and
 // columns in pixels of the frame that FindMatch compares, of the best placements of the templates

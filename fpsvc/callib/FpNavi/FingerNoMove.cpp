@@ -5,12 +5,12 @@
 #include "NaviFrame.h"
 #include "NaviMath.h"
 #include "NaviParam.h"
+#include "ShiftTest.h"
 
 namespace fpnavi {
 namespace {
 
 constexpr int32_t kBlockNum = 5;
-constexpr int32_t kMinNone = 256;  // above every mean of 8-bit differences: no shift was counted
 
 // The regions that are compared: four border bands without the corners, and the centre.
 struct Block {
@@ -102,16 +102,22 @@ int32_t LeastDifference(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr
     return min;
 }
 
+// Outcome of the least difference of all shifts.
+int32_t Judge(int32_t min) {
+    if (min < s_diffThresholdTol)
+        return kNoMoveResting;
+    return min == kMinNone ? kNoMoveUndetermined : kNoMoveMoved;
+}
+
 }  // namespace
 
 int32_t FingerNoMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
     if (!HasPixels(img_prev) || !HasPixels(img_curr) || img_prev->width != img_curr->width ||
         img_prev->height != img_curr->height)
         return kNoMoveFailed;
-    const int32_t min = LeastDifference(img_prev, img_curr);
-    if (min < s_diffThresholdTol)
-        return kNoMoveResting;
-    return min == kMinNone ? kNoMoveUndetermined : kNoMoveMoved;
+    if (CanTestShifts(*img_prev))
+        return TestShifts(*img_prev, *img_curr);
+    return Judge(LeastDifference(img_prev, img_curr));
 }
 
 }  // namespace fpnavi

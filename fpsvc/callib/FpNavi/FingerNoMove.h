@@ -14,6 +14,10 @@ inline constexpr int32_t kNoMoveResting = 0;       // some small shift makes the
 inline constexpr int32_t kNoMoveMoved = 1;         // none does
 inline constexpr int32_t kNoMoveUndetermined = 2;  // no shift has enough common finger area
 
+// Start of the least mean difference: above every mean of 8-bit differences, so that it stands for
+// no shift counted.
+inline constexpr int32_t kMinNone = 256;
+
 // Compares the frames at every shift within s_smallMoveTolRow and s_smallMoveTolCol. Returns one
 // of the outcomes above.
 int32_t FingerNoMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr);

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "FingerDetect.h"
+#include "GreyHistogram.h"
 #include "NaviMath.h"
 #include "NaviParam.h"
 
@@ -13,7 +14,6 @@ constexpr int32_t colNum = 4;
 constexpr int32_t rowNum = 4;
 constexpr int32_t blkNum = colNum * rowNum;
 constexpr int32_t kSpreadNone = -1;  // below every spread of block means
-constexpr int32_t kGreyLevels = 256;
 
 // First pixel of block k of the frame at buffer, blocks counted row by row.
 const uint8_t* BlockAt(const uint8_t* buffer, int32_t k, int32_t blkWidth, int32_t blkHeight) {
@@ -33,14 +33,13 @@ int32_t BlockMean(const uint8_t* block, int32_t blkWidth, int32_t blkHeight) {
 // a pixel). Grey 0 is never accumulated; a crossing that is not found leaves its level alone.
 void FindCrossings(const int32_t* hist, int32_t lowLimit, int32_t highLimit, int32_t* iLow,
                    int32_t* iHigh) {
-    int32_t below = 0;  // hundredfold counts: at most 100 * 2^20 < 2^31
-    for (int32_t i = 1; i < kGreyLevels; ++i) {
-        const int32_t upTo = below + 100 * hist[i];
-        if (below <= lowLimit && upTo > lowLimit)
-            *iLow = i - 1;
-        if (below < highLimit && upTo >= highLimit)
-            *iHigh = i;
-        below = upTo;
+    if (lowLimit >= 0) {
+        const int32_t level = FirstLevelAbove(hist, 0, lowLimit);
+        *iLow = level < kGreyLevels ? level - 1 : *iLow;
+    }
+    if (highLimit > 0) {
+        const int32_t level = FirstLevelAbove(hist, 0, highLimit - 1);
+        *iHigh = level < kGreyLevels ? level : *iHigh;
     }
 }
 

@@ -52,9 +52,8 @@ int32_t GetFullImg(const NaviFrame_t* img, NaviFrame_t* full_img) {
     full_img->width = img->width + 2 * s_gapWidth;
     full_img->height = img->height + 2 * s_gapHeight;
     const int32_t size = full_img->width * full_img->height;  // at most 2^24
-    if (!ReplaceBuffers(full_img, size))
+    if (!ReplaceBuffers(full_img, size, kTypeGap))
         return -1;
-    std::memset(full_img->pType, kTypeGap, static_cast<size_t>(size));
     const Bands columns = CutBands(s_boundWidth, s_centerWidth, s_gapWidth);
     const Bands rows = CutBands(s_boundHeight, s_centerHeight, s_gapHeight);
     for (int32_t b = 0; b < 3; ++b) {

@@ -5,15 +5,15 @@
 
 #include "FindCandidate.h"
 #include "FullImage.h"
+#include "JointSearch.h"
 #include "NaviFrame.h"
 #include "NaviMath.h"
 #include "NaviParam.h"
 #include "NaviVoteInfo.h"
+#include "TileMatch.h"
 
 namespace fpnavi {
 namespace {
-
-constexpr int32_t kDiffWorst = 255;  // score of a candidate with too little common finger area
 
 // Mean grey difference between p_im1 and p_im2 where pixel (row, column) of the first meets
 // (row + di, column + dj) of the second, over the pixels that are finger in both; kDiffWorst when
@@ -71,12 +71,46 @@ bool BuildFullImages() {
 }
 
 // s_candidateNum zeroes, or null.
-int32_t* AllocateCandidates() {
+template <typename Entry>
+Entry* AllocateCandidates() {
+    if (s_candidateNum < 1)
+        return nullptr;
     const size_t num = static_cast<size_t>(s_candidateNum);
-    int32_t* const candidates = static_cast<int32_t*>(std::malloc(num * sizeof(int32_t)));
+    Entry* const candidates = static_cast<Entry*>(std::malloc(num * sizeof(Entry)));
     if (candidates != nullptr)
-        std::fill_n(candidates, num, 0);
+        std::fill_n(candidates, num, Entry{0});
     return candidates;
+}
+
+// The displacement of the pair, pixels to the right and upwards, and its score.
+struct JointResult {
+    int32_t dx;
+    int32_t dy;
+    int32_t diff;
+};
+
+// Rows count downwards, dy upwards; the match goes from the frame that the templates were cut from.
+JointResult Orient(const Match& match) {
+    const int32_t sign = s_imageCurr.cvr > s_imagePrev.cvr ? -1 : 1;
+    return {WrapMul(-sign, match.displacement.dj), WrapMul(sign, match.displacement.di),
+            match.diff};
+}
+
+// Small frames: both steps in one. The full images are built all the same, for whoever reads them.
+bool JoinSmall(const TemplateSet& set, JointResult* result) {
+    uint32_t* const candidateList = AllocateCandidates<uint32_t>();
+    const bool joined = candidateList != nullptr && (s_multiBloclkFlag != 1 || BuildFullImages());
+    if (joined)
+        *result = Orient(SearchJointly(set, candidateList));
+    std::free(candidateList);
+    return joined;
+}
+
+// Frames of any size: the candidate search, then the match.
+bool JoinAny(int32_t* candidate_i, int32_t* candidate_j, JointResult* result) {
+    return FindCandidate(candidate_i, candidate_j) == 0 &&
+           (s_multiBloclkFlag != 1 || BuildFullImages()) &&
+           FindMatch(candidate_i, candidate_j, &result->dx, &result->dy, &result->diff) == 0;
 }
 
 }  // namespace
@@ -111,22 +145,19 @@ int32_t FindMatch(const int32_t* candidate_di, const int32_t* candidate_dj, int3
 }
 
 int32_t CalcImgJoint() {
-    int32_t* const candidate_i = AllocateCandidates();
-    int32_t* const candidate_j = AllocateCandidates();
-    int32_t result = -1;
-    if (candidate_i != nullptr && candidate_j != nullptr &&
-        FindCandidate(candidate_i, candidate_j) == 0 &&
-        (s_multiBloclkFlag != 1 || BuildFullImages())) {
-        int32_t dx = 0;
-        int32_t dy = 0;
-        int32_t diff = 0;
-        result = FindMatch(candidate_i, candidate_j, &dx, &dy, &diff);
-        if (result == 0)
-            RecordMatch(dx, dy, diff);
-    }
+    int32_t* const candidate_i = AllocateCandidates<int32_t>();
+    int32_t* const candidate_j = AllocateCandidates<int32_t>();
+    TemplateSet set;
+    JointResult result = {0, 0, 0};
+    bool joined = false;
+    if (candidate_i != nullptr && candidate_j != nullptr && CutTemplates(&set))
+        joined = CanSearchJointly(set) ? JoinSmall(set, &result)
+                                       : JoinAny(candidate_i, candidate_j, &result);
+    if (joined)
+        RecordMatch(result.dx, result.dy, result.diff);
     std::free(candidate_i);
     std::free(candidate_j);
-    return result;
+    return joined ? 0 : -1;
 }
 
 }  // namespace fpnavi

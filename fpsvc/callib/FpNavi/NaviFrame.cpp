@@ -28,7 +28,7 @@ bool HasPixels(const NaviFrame_t* img) {
            img->height >= 1;
 }
 
-bool ReplaceBuffers(NaviFrame_t* img, int32_t size) {
+bool ReplaceBuffers(NaviFrame_t* img, int32_t size, uint8_t type) {
     ReleaseBuffers(img);
     const size_t bytes = static_cast<size_t>(size);
     img->pData = static_cast<uint8_t*>(std::malloc(bytes));
@@ -38,7 +38,7 @@ bool ReplaceBuffers(NaviFrame_t* img, int32_t size) {
         return false;
     }
     std::memset(img->pData, 0, bytes);
-    std::memset(img->pType, 0, bytes);
+    std::memset(img->pType, type, bytes);
     return true;
 }
 
@@ -49,7 +49,7 @@ int32_t ImgInit(NaviFrame_t* img, int32_t i_start, int32_t i_end, int32_t j_star
         return -1;
     const int32_t height = i_end - i_start;
     const int32_t width = j_end - j_start;
-    if (!ReplaceBuffers(img, height * width))
+    if (!ReplaceBuffers(img, height * width, 0))
         return -1;
     img->height = height;
     img->width = width;
@@ -76,7 +76,7 @@ int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src) {
     img_dst->height = img_src->height;
     img_dst->width = img_src->width;
     const int32_t size = img_src->width * img_src->height;
-    if (!ReplaceBuffers(img_dst, size))
+    if (!ReplaceBuffers(img_dst, size, 0))
         return -1;
     std::memcpy(img_dst->pData, img_src->pData, static_cast<size_t>(size));
     std::memcpy(img_dst->pType, img_src->pType, static_cast<size_t>(size));

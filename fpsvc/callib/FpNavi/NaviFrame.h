@@ -29,9 +29,10 @@ void ImgClear(NaviFrame_t* img);
 // stays as it is) or an allocation failed (img_dst has the new sizes but no buffers).
 int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src);
 
-// Replaces both buffers of img by fresh ones of size bytes each, all 0. Returns false, with both
-// pointers null, when an allocation fails; sizes and measures are the caller's to set.
-bool ReplaceBuffers(NaviFrame_t* img, int32_t size);
+// Replaces both buffers of img by fresh ones of size bytes each: greys of 0, classes of type.
+// Returns false, with both pointers null, when an allocation fails; sizes and measures are the
+// caller's to set.
+bool ReplaceBuffers(NaviFrame_t* img, int32_t size, uint8_t type);
 
 // img has both buffers and at least one pixel.
 bool HasPixels(const NaviFrame_t* img);

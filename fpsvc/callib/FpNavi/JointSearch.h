@@ -1,0 +1,27 @@
+// Candidate search and match of small frames in one step: the same displacement and score as
+// FindCandidate and FindMatch one after the other. Owns nothing but its scratch.
+#ifndef FPNAVI_JOINTSEARCH_H
+#define FPNAVI_JOINTSEARCH_H
+
+#include <cstdint>
+
+#include "PlacementDiffs.h"
+#include "Templates.h"
+
+namespace fpnavi {
+
+struct Match {
+    Displacement displacement;
+    int32_t diff;
+};
+
+// The frames and templates of set are small enough.
+bool CanSearchJointly(const TemplateSet& set);
+
+// The best match of all candidates, between the frame that the templates are cut from and the
+// searched one. candidateList: s_candidateNum keys, the caller's, used as scratch.
+Match SearchJointly(const TemplateSet& set, uint32_t* candidateList);
+
+}  // namespace fpnavi
+
+#endif  // FPNAVI_JOINTSEARCH_H
