@@ -1,0 +1,258 @@
+// The full image and the scores of displacements against the plain model, both of the general match
+// and of the one tile by tile.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <limits>
+#include <vector>
+
+#include "FullImage.h"
+#include "NaviFrame.h"
+#include "NaviParam.h"
+#include "StepFrames.h"
+#include "StepTestPair.h"
+#include "TileMatch.h"
+
+namespace fpnavi_test {
+namespace {
+
+using host::ParamValue;
+using host::SimRandom;
+
+// Both sides' image of the full size, released at the end.
+struct FullPair {
+    ::NaviFrame_t module = {};
+    reference::NaviFrame_t plain = {};
+
+    FullPair() = default;
+    FullPair(const FullPair&) = delete;
+    FullPair& operator=(const FullPair&) = delete;
+    ~FullPair() {
+        fpnavi::ImgClear(&module);
+        reference::ImgClear(&plain);
+    }
+};
+
+TEST(StepGetFullImg, RandomTilesGiveTheSameBuffers) {
+    const int64_t cases = StepCases(20000);
+    FullPair full;
+    int64_t built = 0;
+    for (int64_t i = 0; i < cases; ++i) {
+        SimRandom random = StepRandom(401, i);
+        const FrameSize size = RandomSize(random);
+        const int32_t boundWidth = random.Range(0, size.width / 2);
+        const int32_t boundHeight = random.Range(0, size.height / 2);
+        const int32_t wrong = random.Chance(8) ? random.Range(-2, 2) : 0;
+        SetStepParams(size, {{"s_boundWidth", boundWidth},
+                             {"s_boundHeight", boundHeight},
+                             {"s_centerWidth", size.width - 2 * boundWidth + wrong},
+                             {"s_centerHeight", size.height - 2 * boundHeight},
+                             {"s_gapWidth", random.Range(random.Chance(5) ? -1 : 0, 20)},
+                             {"s_gapHeight", random.Range(0, random.Chance(5) ? 200 : 20)}});
+        TwinFrame source{size, RandomGreys(random, size), RandomTypes(random, size)};
+        const int32_t result = fpnavi::GetFullImg(source.Module(), &full.module);
+        ASSERT_EQ(result, reference::GetFullImg(source.Plain(), &full.plain)) << "case " << i;
+        built += result == 0 ? 1 : 0;
+        ASSERT_TRUE(source.Same()) << "case " << i;
+        ASSERT_TRUE(SameFrame(full.module, full.plain)) << "case " << i;
+    }
+    EXPECT_GT(built, cases / 2);
+}
+
+// A state with full images where the parameters ask for them. Returns false when they cannot be
+// built.
+bool LoadMatchFrames(SimRandom& random, const host::ParamBlock& params) {
+    SetStepParams(params);
+    LoadPair(RandomPair(random, SizeOf(params)));
+    if (ParamValue(params, "s_multiBloclkFlag") != 1)
+        return true;
+    const bool built = fpnavi::GetFullImg(&fpnavi::s_imagePrev, &fpnavi::s_fullImagePrev) == 0 &&
+                       fpnavi::GetFullImg(&fpnavi::s_imageCurr, &fpnavi::s_fullImageCurr) == 0;
+    const bool builtPlain =
+        reference::GetFullImg(&reference::s_imagePrev, &reference::s_fullImagePrev) == 0 &&
+        reference::GetFullImg(&reference::s_imageCurr, &reference::s_fullImageCurr) == 0;
+    EXPECT_EQ(built, builtPlain);
+    return built;
+}
+
+// Both sides of the frames that are compared, full images where there are any.
+FrameSize ComparedSize() {
+    if (fpnavi::s_multiBloclkFlag == 1)
+        return {fpnavi::s_fullImageWidth, fpnavi::s_fullImageHeight};
+    return {fpnavi::s_imageWidth, fpnavi::s_imageHeight};
+}
+
+int32_t RandomDisplacement(SimRandom& random, int32_t side) {
+    if (random.Chance(2))
+        return random.Chance(50) ? std::numeric_limits<int32_t>::min()
+                                 : std::numeric_limits<int32_t>::max();
+    if (random.Chance(50))
+        return random.Range(-6, 6);
+    return random.Range(-side - 2, side + 2);
+}
+
+TEST(StepFindMatch, RandomDisplacementsGiveTheSameBest) {
+    const int64_t cases = StepCases(4000);
+    for (int64_t i = 0; i < cases; ++i) {
+        SimRandom random = StepRandom(411, i);
+        const host::ParamBlock params = RandomSearchParams(random, RandomSize(random));
+        if (!LoadMatchFrames(random, params))
+            continue;
+        const FrameSize compared = ComparedSize();
+        const size_t num = static_cast<size_t>(fpnavi::s_candidateNum);
+        std::vector<int32_t> di(num);
+        std::vector<int32_t> dj(num);
+        for (size_t n = 0; n < num; ++n) {
+            di[n] = RandomDisplacement(random, compared.height);
+            dj[n] = RandomDisplacement(random, compared.width);
+        }
+        ASSERT_EQ(ModuleMatch(di, dj), PlainMatch(di, dj)) << "case " << i;
+        ASSERT_TRUE(SameState()) << "case " << i;
+    }
+}
+
+// The score of a displacement tile by tile: exact up to most, only "above" beyond it.
+void CompareScore(int32_t di, int32_t dj, int32_t score) {
+    for (const int32_t most : {0, score - 1, score, score + 1, 254, 255, 256}) {
+        if (most < 0 || most > 256)
+            continue;
+        const int32_t module = fpnavi::MatchAt({di, dj}, most);
+        if (score <= most) {
+            ASSERT_EQ(module, score) << "at most " << most;
+        } else {
+            ASSERT_GT(module, most) << "score " << score;
+        }
+    }
+}
+
+void SetTileFrames() {
+    const bool fromPrev = fpnavi::s_imageCurr.cvr > fpnavi::s_imagePrev.cvr;
+    fpnavi::SetMatchFrames(fromPrev ? fpnavi::s_imagePrev : fpnavi::s_imageCurr,
+                           fromPrev ? fpnavi::s_imageCurr : fpnavi::s_imagePrev);
+}
+
+TEST(StepMatchAt, RandomDisplacementsOfTilesGiveTheSameScore) {
+    const int64_t cases = StepCases(12000);
+    PathCount paths;
+    int64_t scores = 0;
+    for (int64_t i = 0; i < cases; ++i) {
+        SimRandom random = StepRandom(421, i);
+        const host::ParamBlock params = RandomSearchParams(random, RandomSize(random));
+        const bool loaded = LoadMatchFrames(random, params);
+        paths.Note(loaded && fpnavi::CanMatchTiles(fpnavi::s_imageCurr));
+        if (!loaded || !fpnavi::CanMatchTiles(fpnavi::s_imageCurr))
+            continue;
+        SetTileFrames();
+        const FrameSize compared = ComparedSize();
+        for (int32_t n = 0; n < 8; ++n, ++scores) {
+            const int32_t di = random.Chance(60) ? random.Range(-10, 10)
+                                                 : random.Range(-compared.height, compared.height);
+            const int32_t dj = random.Chance(60) ? random.Range(-10, 10)
+                                                 : random.Range(-compared.width, compared.width);
+            CompareScore(di, dj, PlainScore(di, dj));
+            ASSERT_FALSE(::testing::Test::HasFailure())
+                << "case " << i << ", displacement " << di << ", " << dj;
+        }
+    }
+    paths.ExpectBoth();
+    RecordProperty("scores", static_cast<int>(scores));
+}
+
+// All displacements of small frames, at which every pair of tiles meets.
+TEST(StepMatchAt, EveryDisplacementOfSmallFramesGivesTheSameScore) {
+    const int64_t cases = StepCases(200) / 4;
+    for (int64_t i = 0; i < cases; ++i) {
+        SimRandom random = StepRandom(422, i);
+        const FrameSize size = {random.Range(1, 14), random.Range(1, 14)};
+        host::ParamBlock params = RandomSearchParams(random, size);
+        const int32_t bound = random.Range(0, std::min(size.width, size.height) / 2);
+        SetTiles(params, size, bound, random.Range(0, 6));
+        if (!LoadMatchFrames(random, params))
+            continue;
+        ASSERT_TRUE(fpnavi::CanMatchTiles(fpnavi::s_imageCurr));
+        SetTileFrames();
+        const FrameSize compared = ComparedSize();
+        for (int32_t di = -compared.height - 1; di <= compared.height + 1; ++di) {
+            for (int32_t dj = -compared.width - 1; dj <= compared.width + 1; ++dj) {
+                const int32_t score = PlainScore(di, dj);
+                ASSERT_EQ(fpnavi::MatchAt({di, dj}, 256), score)
+                    << "case " << i << ", displacement " << di << ", " << dj;
+            }
+        }
+    }
+}
+
+// Displacements of the whole side and beyond, at the sides where a row fills its word.
+TEST(StepMatchAt, SidesOf63And64AtTheirFarthestDisplacements) {
+    SimRandom random = StepRandom(423, 0);
+    for (const FrameSize size : {FrameSize{63, 64}, FrameSize{64, 63}, FrameSize{64, 64}}) {
+        for (const int32_t multi : {0, 1}) {
+            host::ParamBlock params = host::ParamsForMode(host::Mode::Fp, false);
+            SetTiles(params, size, 8, multi * 4);
+            ParamValue(params, "s_multiBloclkFlag") = multi;
+            ParamValue(params, "s_overlapAreaMinFp") = 0;
+            ASSERT_TRUE(LoadMatchFrames(random, params));
+            SetTileFrames();
+            for (const int32_t di : {-72, -71, -65, -64, -63, -62, 0, 62, 63, 64, 65, 70, 71, 72}) {
+                for (const int32_t dj : {-72, -65, -64, -63, -1, 0, 1, 63, 64, 65, 71, 72})
+                    ASSERT_EQ(fpnavi::MatchAt({di, dj}, 256), PlainScore(di, dj))
+                        << di << ", " << dj << ", multi " << multi;
+            }
+        }
+    }
+}
+
+// Black against a flat grey: the sum reaches its limit with the last pixel, or not at all.
+TEST(StepMatchAtTrap, EarlyStopIsExactAtTheLimit) {
+    const FrameSize size = {40, 30};
+    host::ParamBlock params = host::ParamsForMode(host::Mode::Fp, false);
+    SetTiles(params, size, 8, 4);
+    SetStepParams(params);
+    for (const int32_t grey : {1, 9, 100, 254, 255}) {
+        std::vector<uint8_t> greys = FlatBytes(size, static_cast<uint8_t>(grey));
+        for (const bool oneLess : {false, true}) {
+            greys.back() = static_cast<uint8_t>(oneLess ? grey - 1 : grey);
+            LoadPair({FlatBytes(size, 0), FlatBytes(size, 1), greys, FlatBytes(size, 1)});
+            SetTileFrames();
+            const int32_t score = oneLess ? grey - 1 : grey;
+            ASSERT_EQ(fpnavi::MatchAt({0, 0}, score), score);
+            if (score > 0) {
+                ASSERT_GT(fpnavi::MatchAt({0, 0}, score - 1), score - 1);
+            }
+            ASSERT_EQ(fpnavi::MatchAt({0, 0}, 256), score);
+        }
+    }
+}
+
+// The match asks for more than its minimum, where the no-move test takes exactly that.
+TEST(StepMatchAtTrap, AreaOfExactlyTheMinimumIsTooLittle) {
+    const FrameSize size = {40, 30};
+    for (const int32_t multi : {0, 1}) {
+        for (const int32_t beyond : {-1, 0, 1}) {
+            const int32_t pixels = static_cast<int32_t>(size.Pixels());
+            host::ParamBlock params = host::ParamsForMode(host::Mode::Fp, false);
+            SetTiles(params, size, 8, 4);
+            ParamValue(params, "s_multiBloclkFlag") = multi;
+            ParamValue(params, "s_overlapAreaMinFp") = pixels + beyond;
+            ParamValue(params, "s_candidateNum") = 1;
+            SimRandom random = StepRandom(424, 0);
+            ASSERT_TRUE(LoadMatchFrames(random, params));
+            const std::vector<uint8_t> greys = FlatBytes(size, 77);
+            LoadPair({greys, FlatBytes(size, 1), greys, FlatBytes(size, 1)});
+            if (multi == 1) {
+                fpnavi::GetFullImg(&fpnavi::s_imagePrev, &fpnavi::s_fullImagePrev);
+                fpnavi::GetFullImg(&fpnavi::s_imageCurr, &fpnavi::s_fullImageCurr);
+                reference::GetFullImg(&reference::s_imagePrev, &reference::s_fullImagePrev);
+                reference::GetFullImg(&reference::s_imageCurr, &reference::s_fullImageCurr);
+            }
+            SetTileFrames();
+            const int32_t expected = beyond < 0 ? 0 : 255;
+            EXPECT_EQ(fpnavi::MatchAt({0, 0}, 256), expected) << "multi " << multi;
+            EXPECT_EQ(ModuleMatch({0}, {0}).difference, expected) << "multi " << multi;
+            EXPECT_EQ(PlainScore(0, 0), expected) << "multi " << multi;
+        }
+    }
+}
+
+}  // namespace
+}  // namespace fpnavi_test

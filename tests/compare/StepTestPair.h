@@ -1,0 +1,94 @@
+// Parameters and frame pairs for the comparison of single steps: the same state on both sides, set
+// up through the functions of each.
+#ifndef TESTS_COMPARE_STEPTESTPAIR_H
+#define TESTS_COMPARE_STEPTESTPAIR_H
+
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <initializer_list>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "ParamTable.h"
+#include "StepFrames.h"
+#include "Templates.h"
+
+namespace fpnavi_test {
+
+using ParamChanges = std::initializer_list<std::pair<std::string_view, int32_t>>;
+
+// Both sides take the defaults of the fp mode with changes; the image is one block of size.
+void SetStepParams(FrameSize size, ParamChanges changes = {});
+void SetStepParams(const host::ParamBlock& params);
+
+// Tiles, gaps, templates and thresholds of the candidate search and the match for an image of size:
+// fitting ones for the most part, and cheap enough for the plain model.
+host::ParamBlock RandomSearchParams(host::SimRandom& random, FrameSize size);
+
+// Tiles of the whole image: borders of bound, gaps of gap, the centre between them.
+void SetTiles(host::ParamBlock& params, FrameSize size, int32_t bound, int32_t gap);
+
+FrameSize SizeOf(const host::ParamBlock& params);
+
+// s_imagePrev and s_imageCurr of both sides from greys and class maps, and measured.
+struct PairBytes {
+    std::vector<uint8_t> prevGreys;
+    std::vector<uint8_t> prevTypes;
+    std::vector<uint8_t> currGreys;
+    std::vector<uint8_t> currTypes;
+};
+PairBytes RandomPair(host::SimRandom& random, FrameSize size);
+void LoadPair(const PairBytes& pair);
+
+// The frames of the gesture are loaded, pre-processed (class maps are ignored) and measured.
+void LoadPreProcessed(const PairBytes& pair);
+
+// Both sides have the same four frames and the same record.
+::testing::AssertionResult SameState();
+
+// FingerNoMove of both sides, which must agree, in the module's numbers.
+int32_t NoMove(TwinFrame* prev, TwinFrame* curr);
+
+struct Candidates {
+    int32_t result = 0;
+    std::vector<int32_t> di;
+    std::vector<int32_t> dj;
+
+    bool operator==(const Candidates& other) const {
+        return result == other.result && di == other.di && dj == other.dj;
+    }
+};
+Candidates ModuleCandidates();
+Candidates PlainCandidates();
+
+struct MatchResult {
+    int32_t dx;
+    int32_t dy;
+    int32_t difference;
+
+    bool operator==(const MatchResult& other) const {
+        return dx == other.dx && dy == other.dy && difference == other.difference;
+    }
+};
+std::ostream& operator<<(std::ostream& out, const MatchResult& match);
+MatchResult ModuleMatch(const std::vector<int32_t>& di, const std::vector<int32_t>& dj);
+MatchResult PlainMatch(const std::vector<int32_t>& di, const std::vector<int32_t>& dj);
+// What the plain model scores for this displacement alone.
+int32_t PlainScore(int32_t di, int32_t dj);
+
+// CalcImgJoint of both, and what the module left at the record's first entry.
+struct JointOutcome {
+    int32_t module;
+    int32_t plain;
+    bool fast;  // the module searched and matched in one step
+};
+JointOutcome CalcJoint();
+
+// The module tabulates the placements of the current pair, or scores them one by one.
+bool IsTabulated();
+
+}  // namespace fpnavi_test
+
+#endif  // TESTS_COMPARE_STEPTESTPAIR_H
