@@ -1,0 +1,40 @@
+// Times: a call at a time, in rounds over all pairs, medians over rounds and then over pairs.
+#ifndef BENCH_TIMING_H
+#define BENCH_TIMING_H
+
+#include <chrono>
+#include <vector>
+
+namespace bench {
+
+// Nanoseconds that two readings of the clock with nothing between them are apart.
+double ClockCost();
+
+// Nanoseconds of one call of f, without the clock's own.
+template <class F>
+double TimeOf(const F& f) {
+    const auto start = std::chrono::steady_clock::now();
+    f();
+    const auto end = std::chrono::steady_clock::now();
+    return std::chrono::duration<double, std::nano>(end - start).count() - ClockCost();
+}
+
+// The middle value; values is not empty.
+double Median(std::vector<double> values);
+
+// All times of one step: the same number of rounds for each pair. Rounds go over all pairs before
+// any pair comes again, so that the branch predictor cannot learn one.
+class Times {
+  public:
+    explicit Times(size_t pairs) : m_ofPair(pairs) {}
+    void Add(size_t pair, double nanoseconds) { m_ofPair[pair].push_back(nanoseconds); }
+    // Microseconds: the median over the pairs of each pair's median.
+    double MedianMicroseconds() const;
+
+  private:
+    std::vector<std::vector<double>> m_ofPair;
+};
+
+}  // namespace bench
+
+#endif  // BENCH_TIMING_H
