@@ -181,10 +181,14 @@ TEST_F(FingerNoMoveTest, ShiftWithoutOneCommonPixelNeverCounts) {
 }
 
 TEST_F(FingerNoMoveTest, NegativeTolerancesTryNoShift) {
-    Params().Set("s_smallMoveTolRow", -1).Apply();
-    TestFrame prev(56, 36, 50, 1);
-    TestFrame curr(56, 36, 50, 1);
-    EXPECT_EQ(fpnavi::FingerNoMove(prev.Get(), curr.Get()), kNoMoveUndetermined);
+    for (const char* const name : {"s_smallMoveTolRow", "s_smallMoveTolCol"}) {
+        for (const int32_t tolerance : {-1, std::numeric_limits<int32_t>::min()}) {
+            Params().Set(name, tolerance).Apply();
+            TestFrame prev(56, 36, 50, 1);
+            TestFrame curr(56, 36, 50, 1);
+            EXPECT_EQ(fpnavi::FingerNoMove(prev.Get(), curr.Get()), kNoMoveUndetermined);
+        }
+    }
 }
 
 TEST_F(FingerNoMoveTest, AnyBoundSizeStaysInsideTheFrame) {

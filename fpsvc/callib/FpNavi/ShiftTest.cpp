@@ -76,6 +76,26 @@ bool IsBelowTolerance(const ShiftedPairings& pairings) {
     return AreaCounts(area) && sum / area < s_diffThresholdTol;
 }
 
+// Calls visit with every shift within the tolerances, first with none at all, until it returns
+// true. Returns whether it did.
+template <typename Visit>
+bool VisitShifts(const NaviFrame_t& img, Visit visit) {
+    if (s_smallMoveTolRow < 0 || s_smallMoveTolCol < 0)  // no shift at all
+        return false;
+    // Beyond the frame's sides no pixel meets another.
+    const int32_t drMax = std::min(s_smallMoveTolRow, img.height);
+    const int32_t dcMax = std::min(s_smallMoveTolCol, img.width);
+    if (visit(0, 0))
+        return true;
+    for (int32_t dr = -drMax; dr <= drMax; ++dr) {
+        for (int32_t dc = -dcMax; dc <= dcMax; ++dc) {
+            if ((dr != 0 || dc != 0) && visit(dr, dc))
+                return true;
+        }
+    }
+    return false;
+}
+
 }  // namespace
 
 bool CanTestShifts(const NaviFrame_t& img) {
@@ -88,23 +108,14 @@ int32_t TestShifts(const NaviFrame_t& img_prev, const NaviFrame_t& img_curr) {
     LayOut(img_curr, &s_maskedSecond);
     const Thirds rows = CutThirds(img_prev.height, s_boundHeight);
     const Thirds columns = CutThirds(img_prev.width, s_boundWidth);
-    // Beyond the frame's sides no pixel meets another.
-    const int32_t drMax = std::min(s_smallMoveTolRow, img_prev.height);
-    const int32_t dcMax = std::min(s_smallMoveTolCol, img_prev.width);
     bool counted = false;
     const auto visit = [&](int32_t dr, int32_t dc) {
         const ShiftedPairings pairings = PairBlocks(rows, columns, dr, dc);
         counted = counted || AreaCounts(Area(pairings));
         return IsBelowTolerance(pairings);
     };
-    if (drMax >= 0 && dcMax >= 0 && visit(0, 0))
+    if (VisitShifts(img_prev, visit))
         return kNoMoveResting;
-    for (int32_t dr = -drMax; dr <= drMax; ++dr) {
-        for (int32_t dc = -dcMax; dc <= dcMax; ++dc) {
-            if ((dr != 0 || dc != 0) && visit(dr, dc))
-                return kNoMoveResting;
-        }
-    }
     if (!counted && kMinNone < s_diffThresholdTol)
         return kNoMoveResting;
     return counted ? kNoMoveMoved : kNoMoveUndetermined;
