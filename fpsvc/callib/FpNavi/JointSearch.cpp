@@ -50,8 +50,8 @@ void ForEachUpTo(const PlacementDiffs& table, int32_t most, Visit visit) {
     }
 }
 
-// Fills candidateList with the s_candidateNum smallest keys, in no order; sentinels where there are
-// fewer placements.
+// Fills candidateList with the s_candidateNum smallest keys, the smallest first and the others in
+// no order; sentinels where there are fewer placements.
 void SelectCandidates(const PlacementDiffs* tables, uint32_t* candidateList) {
     uint32_t counts[256];
     CountDiffs(tables, counts);
@@ -78,6 +78,8 @@ void SelectCandidates(const PlacementDiffs* tables, uint32_t* candidateList) {
         std::nth_element(s_keys, s_keys + taken, s_keys + ties);
     std::copy_n(s_keys, taken, candidateList + kept);
     std::fill(candidateList + kept + taken, candidateList + num, kKeySentinel);
+    // The best placement comes first: it mostly matches best, and then the others stop early.
+    std::iter_swap(candidateList, std::min_element(candidateList, candidateList + num));
 }
 
 // The best score of all candidates, and the displacements that have it.

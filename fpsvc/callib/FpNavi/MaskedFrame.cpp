@@ -80,10 +80,13 @@ uint64_t LayOutRow(const uint8_t* grey, const uint8_t* type, int32_t width, uint
 }  // namespace
 
 void LayOut(const NaviFrame_t& img, MaskedFrame* masked) {
-    // Everything up to the room behind the last row, which reaches on where a row would begin.
-    const size_t bytes = static_cast<size_t>(RowPlace(img.height));
-    std::memset(masked->low, 0, bytes);
-    std::memset(masked->high, 255, bytes);
+    // A frame of the same size leaves the bytes around it as they were.
+    if (masked->width != img.width || masked->height != img.height) {
+        std::memset(masked->low, 0, sizeof masked->low);
+        std::memset(masked->high, 255, sizeof masked->high);
+        masked->width = img.width;
+        masked->height = img.height;
+    }
     masked->area = 0;
     for (int32_t row = 0; row < img.height; ++row) {
         const int32_t at = row * img.width;
@@ -107,15 +110,14 @@ int64_t DifferenceSum(const MaskedFrame& first, const MaskedFrame& second, const
                       int64_t limit) {
     Bytes16 mask[kRowSteps];
     SpreadMask(pairing.columns, mask);
+    const int32_t offset = pairing.rowOffset * kRowStride + pairing.columnOffset;
     int64_t sum = 0;
     uint64_t rows = pairing.rows;
     while (rows != 0 && sum < limit) {
         Sums sums = NoSums();
         for (int32_t n = 0; n < kRowsPerCheck && rows != 0; ++n, rows &= rows - 1) {
-            const int32_t row = __builtin_ctzll(rows);
-            sums =
-                AddRowDifferences(sums, first, RowPlace(row), second,
-                                  RowPlace(row + pairing.rowOffset) + pairing.columnOffset, mask);
+            const int32_t place = RowPlace(__builtin_ctzll(rows));
+            sums = AddRowDifferences(sums, first, place, second, place + offset, mask);
         }
         sum += Total(sums);
     }

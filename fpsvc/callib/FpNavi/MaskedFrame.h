@@ -22,6 +22,8 @@ struct MaskedFrame {
     uint8_t high[kPlaneBytes];
     uint64_t finger[kWordPixels];  // for each row, the columns that are finger
     int32_t area;                  // pixels that are finger
+    int32_t width;                 // of the frame laid out last; all bytes around it are neutral
+    int32_t height;
 };
 
 // Scratch: nothing in it outlives the comparison.

@@ -88,27 +88,39 @@ void CollectAlike(const TemplateSet& set, int32_t k, Alike* alike) {
     }
 }
 
-// Scores the placements of all templates of the size of template k. image: the searched frame.
+// Scores one column of placements, rows of them, in a strip of the template's width; the results
+// go to diff and the places columns further on.
+template <int32_t kFullSteps>
+void ScoreColumn(const uint8_t* strip, int32_t width, int32_t rows, const Packed& tplt,
+                 Bytes16 rest, MeanOf meanOf, uint8_t* diff, int32_t columns) {
+    const Packed packed = tplt;  // a copy that no byte written through diff can touch
+    for (int32_t i = 0; i < rows; ++i) {
+        *diff = meanOf(DifferenceSum<kFullSteps>(strip, packed, rest));
+        strip += width;
+        diff += columns;
+    }
+}
+
+// Scores the placements of all templates of one size. image: the searched frame.
 template <int32_t kFullSteps>
 void ScoreAlike(const TemplateSet& set, const Alike& alike, const uint8_t* image) {
-    const Template& tplt = set.tplts[alike.k[0]];
+    const int32_t width = set.tplts[alike.k[0]].width;
+    const int32_t height = set.tplts[alike.k[0]].height;
     const PlacementDiffs& where = s_diffs[alike.k[0]];
+    const int32_t rows = where.rows;
+    const int32_t columns = where.columns;
     uint8_t restBytes[kLanes] = {};
     std::memset(restBytes, 255, static_cast<size_t>(set.tpltSize % kLanes));
     const Bytes16 rest = Load16(restBytes);
     const MeanOf meanOf(set.tpltSize);
     const int32_t stride = set.searched->width;
+    const uint8_t* const corner = image + where.iFirst * stride + where.jFirst;
     uint8_t strip[kStripBytes] = {};
-    for (int32_t j = 0; j < where.columns; ++j) {
-        CutStrip(image + where.iFirst * stride + where.jFirst + j, stride,
-                 where.rows + tplt.height - 1, tplt.width, strip);
-        for (int32_t t = 0; t < alike.count; ++t) {
-            const Packed packed = alike.packed[t];
-            uint8_t* const diff = s_diffs[alike.k[t]].diff + j;
-            for (int32_t i = 0; i < where.rows; ++i)
-                diff[i * where.columns] =
-                    meanOf(DifferenceSum<kFullSteps>(strip + i * tplt.width, packed, rest));
-        }
+    for (int32_t j = 0; j < columns; ++j) {
+        CutStrip(corner + j, stride, rows + height - 1, width, strip);
+        for (int32_t t = 0; t < alike.count; ++t)
+            ScoreColumn<kFullSteps>(strip, width, rows, alike.packed[t], rest, meanOf,
+                                    s_diffs[alike.k[t]].diff + j, columns);
     }
 }
 

@@ -6,6 +6,7 @@
 #include "NaviFrame.h"
 #include "NaviMath.h"
 #include "NaviParam.h"
+#include "NaviSimd.h"
 #include "PreProcess.h"
 
 namespace fpnavi {
@@ -19,6 +20,25 @@ struct GreySpan {
     int32_t max;
 };
 
+// Copies count greys, those outside the finger area as 0, and returns how many lie inside.
+int32_t CopyFinger(const uint8_t* grey, const uint8_t* type, int32_t count, uint8_t* finger) {
+    const Bytes16 one = Splat16(1);
+    Sums sums = NoSums();
+    int32_t i = 0;
+    for (; i + kLanes <= count; i += kLanes) {
+        const Bytes16 mask = Equal16(Load16(type + i), one);
+        Store16(finger + i, And16(Load16(grey + i), mask));
+        sums = AddBytes(sums, And16(mask, one));
+    }
+    int32_t inside = Total(sums);
+    for (; i < count; ++i) {
+        const bool isFinger = type[i] == 1;
+        finger[i] = isFinger ? grey[i] : uint8_t{0};
+        inside += isFinger ? 1 : 0;
+    }
+    return inside;
+}
+
 // Counts the pixels of the finger area by grey level. Pixels outside are counted as grey 0 at
 // first, without a branch. Two tables take turns, since neighbours are often equal and the second
 // would wait for the first. Returns the number of pixels in the area.
@@ -26,16 +46,12 @@ int32_t CountFingerGreys(const NaviFrame_t& img, int32_t (&hist)[kGreyLevels]) {
     int32_t odd[kGreyLevels] = {};
     std::fill_n(hist, kGreyLevels, 0);
     const int32_t size = img.width * img.height;
-    int32_t outside = 0;
+    int32_t inside = 0;
     for (int32_t start = 0; start < size; start += kChunk) {
         const int32_t count = std::min(kChunk, size - start);
-        const uint8_t* const grey = img.pData + start;
-        const uint8_t* const type = img.pType + start;
-        uint8_t finger[kChunk + 1] = {};  // one more for an odd count
-        for (int32_t i = 0; i < count; ++i)
-            finger[i] = static_cast<uint8_t>(grey[i] & (type[i] == 1 ? 255 : 0));
-        for (int32_t i = 0; i < count; ++i)
-            outside += type[i] != 1;
+        uint8_t finger[kChunk + 1];
+        inside += CopyFinger(img.pData + start, img.pType + start, count, finger);
+        finger[count] = 0;  // makes an even number of an odd one
         for (int32_t i = 0; i < count; i += 2) {
             ++hist[finger[i]];
             ++odd[finger[i + 1]];
@@ -44,8 +60,8 @@ int32_t CountFingerGreys(const NaviFrame_t& img, int32_t (&hist)[kGreyLevels]) {
     }
     for (int32_t i = 0; i < kGreyLevels; ++i)
         hist[i] += odd[i];
-    hist[0] -= outside;
-    return size - outside;
+    hist[0] -= size - inside;
+    return inside;
 }
 
 // hist: counts by grey level, cnt their sum. The cumulative count only grows: it crosses each limit

@@ -36,12 +36,7 @@ struct AxisPairing {
     int32_t offset;
 };
 
-AxisPairing PairAxis(const Axis& axis, int32_t displacement, int32_t step) {
-    const int32_t offset = displacement - step * axis.gap;
-    // A band further on lies behind the one before: no way back leads to it.
-    const bool wrongWay = step > 0 ? offset <= 0 : (step < 0 && offset >= 0);
-    if (wrongWay || offset >= kWordPixels || offset <= -kWordPixels)
-        return {0, offset};
+AxisPairing PairAxis(const Axis& axis, int32_t offset, int32_t step) {
     uint64_t places = 0;
     for (int32_t b = std::max(0, -step); b < kBandMax - std::max(0, step); ++b)
         places |= axis.band[b] & ShiftBits(axis.band[b + step], offset);
@@ -56,17 +51,25 @@ struct AxisMeeting {
     AxisPairing pairings[kStepNum];
 };
 
+void AddStep(const Axis& axis, int32_t offset, int32_t step, AxisMeeting* meeting) {
+    const AxisPairing pairing = PairAxis(axis, offset, step);
+    if (pairing.places == 0)
+        return;
+    meeting->places += CountBits(pairing.places);
+    meeting->pairings[meeting->count++] = pairing;
+}
+
 void MeetAlong(const Axis& axis, int32_t displacement, AxisMeeting* meeting) {
     meeting->displacement = displacement;
     meeting->places = 0;
     meeting->count = 0;
-    for (int32_t step = 1 - kBandMax; step < kBandMax; ++step) {
-        const AxisPairing pairing = PairAxis(axis, displacement, step);
-        if (pairing.places == 0)
-            continue;
-        meeting->places += CountBits(pairing.places);
-        meeting->pairings[meeting->count++] = pairing;
-    }
+    AddStep(axis, displacement, 0, meeting);
+    // A band further on lies behind the one before, so the offset to it is positive, and the other
+    // way round; with each step a gap is taken off.
+    for (int32_t step = 1; step < kBandMax && displacement - step * axis.gap > 0; ++step)
+        AddStep(axis, displacement - step * axis.gap, step, meeting);
+    for (int32_t step = -1; step > -kBandMax && displacement - step * axis.gap < 0; --step)
+        AddStep(axis, displacement - step * axis.gap, step, meeting);
 }
 
 // All pairs of tiles that meet at a displacement. Neighbouring candidates often share the rows.
