@@ -14,8 +14,7 @@ static int RefusesEmptyGeometry(void) {
     return GetNaviBlock(image, 8, 8, image + 32) == -1 && OrientationCalc(image, image, 0) == -1 &&
            vmk_fp_navigation_detect_finger_status(NULL) == -1 && Voting(0) == -1 &&
            Voting(1) == VKEY_NO_MOVE && PrintNaviLog()->calc_cnt == 0 &&
-           GetDoubleScanNaviBlock(0, 0) == 0 &&
-           _NAVI_Tune(NULL, 0, 0, NULL, NULL, NULL) == -1;
+           GetDoubleScanNaviBlock(0, 0) == 0 && _NAVI_Tune(NULL, 0, 0, NULL, NULL, NULL) == -1;
 }
 
 #endif /* CONSUMER_GESTURE_H */
