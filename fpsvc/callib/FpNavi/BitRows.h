@@ -22,6 +22,24 @@ inline uint64_t FirstBits(int32_t count) {
     return count >= kWordPixels ? ~uint64_t{0} : (uint64_t{1} << count) - 1;
 }
 
+// One side of a frame, cut into border, centre and border.
+struct Thirds {
+    uint64_t first;
+    uint64_t centre;
+    uint64_t last;
+};
+
+// The borders of bound pixels lie inside a side that fits a word and do not overlap.
+inline bool CanCutThirds(int32_t side, int32_t bound) {
+    return bound >= 0 && bound <= side / 2;
+}
+
+inline Thirds CutThirds(int32_t side, int32_t bound) {
+    const uint64_t first = FirstBits(bound);
+    const uint64_t upToLast = FirstBits(side - bound);
+    return {first, upToLast & ~first, FirstBits(side) & ~upToLast};
+}
+
 // Column c of the result is column c + offset of bits; columns outside are 0.
 inline uint64_t ShiftBits(uint64_t bits, int32_t offset) {
     if (offset >= kWordPixels || offset <= -kWordPixels)

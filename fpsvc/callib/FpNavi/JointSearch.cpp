@@ -6,7 +6,6 @@
 
 #include <algorithm>
 
-#include "BitRows.h"
 #include "FindCandidate.h"
 #include "NaviParam.h"
 #include "NaviSimd.h"

@@ -1,6 +1,6 @@
 // A small frame laid out for comparing with another one at any displacement: rows of fixed length
-// with room around, pixels outside the finger made neutral. Owns nothing; FingerNoMove and ImgJoint
-// each lay out the two frames that they compare.
+// with room around, pixels outside the finger made neutral. Owns room for the two frames of a pair;
+// ShiftTest and TileMatch lay out there what they compare.
 #ifndef FPNAVI_MASKEDFRAME_H
 #define FPNAVI_MASKEDFRAME_H
 
@@ -26,7 +26,7 @@ struct MaskedFrame {
     int32_t height;
 };
 
-// Scratch: nothing in it outlives the comparison.
+// Scratch: each comparison lays out its frames anew; only the neutral bytes around them stay.
 extern MaskedFrame s_maskedFirst;
 extern MaskedFrame s_maskedSecond;
 

@@ -4,28 +4,13 @@
 #include "ShiftTest.h"
 
 #include <algorithm>
-#include <cstdlib>
 
 #include "FingerNoMove.h"
 #include "MaskedFrame.h"
-#include "NaviMath.h"
 #include "NaviParam.h"
 
 namespace fpnavi {
 namespace {
-
-// One axis of the frame, cut into border, centre, border.
-struct Thirds {
-    uint64_t first;
-    uint64_t centre;
-    uint64_t last;
-};
-
-Thirds CutThirds(int32_t side, int32_t bound) {
-    const uint64_t first = FirstBits(bound);
-    const uint64_t upToCentre = FirstBits(side - bound);
-    return {first, upToCentre & ~first, FirstBits(side) & ~upToCentre};
-}
 
 // Places of part that lie in part after the shift too.
 uint64_t StaysIn(uint64_t part, int32_t shift) {
@@ -99,8 +84,8 @@ bool VisitShifts(const NaviFrame_t& img, Visit visit) {
 }  // namespace
 
 bool CanTestShifts(const NaviFrame_t& img) {
-    return FitsWords(img.width, img.height) && s_boundWidth >= 0 && s_boundWidth <= img.width / 2 &&
-           s_boundHeight >= 0 && s_boundHeight <= img.height / 2;
+    return FitsWords(img.width, img.height) && CanCutThirds(img.width, s_boundWidth) &&
+           CanCutThirds(img.height, s_boundHeight);
 }
 
 int32_t TestShifts(const NaviFrame_t& img_prev, const NaviFrame_t& img_curr) {

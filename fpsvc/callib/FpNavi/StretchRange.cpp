@@ -91,7 +91,7 @@ void MakeStretchTable(const GreySpan& span, uint32_t scale, uint8_t (&table)[kGr
     const uint32_t factor = ((scale << 16) + range - 1) / range;  // at most 255 * 2^16
     for (int32_t grey = 0; grey < kGreyLevels; ++grey) {
         const uint32_t above = static_cast<uint32_t>(std::max(grey - span.min, 0));
-        table[grey] = static_cast<uint8_t>(std::min<uint32_t>(above * factor >> 16, kGreyMax));
+        table[grey] = ClampToGrey(static_cast<int32_t>(above * factor >> 16));
     }
 }
 

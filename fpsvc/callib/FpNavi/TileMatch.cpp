@@ -24,9 +24,8 @@ Axis s_columns;
 Axis CutAxis(int32_t side, int32_t bound, int32_t gap, bool multi) {
     if (!multi)
         return {{FirstBits(side), 0, 0}, 0};
-    const uint64_t first = FirstBits(bound);
-    const uint64_t upToCentre = FirstBits(side - bound);
-    return {{first, upToCentre & ~first, FirstBits(side) & ~upToCentre}, gap};
+    const Thirds thirds = CutThirds(side, bound);
+    return {{thirds.first, thirds.centre, thirds.last}, gap};
 }
 
 // The places of the first frame that meet one of the second when the band there is step bands
@@ -106,9 +105,8 @@ bool CanMatchTiles(const NaviFrame_t& img) {
     if (!FitsWords(img.width, img.height))
         return false;
     return s_multiBloclkFlag != 1 ||
-           (FullImageGeometryUsable() && s_boundWidth >= 0 && s_boundWidth <= img.width / 2 &&
-            s_boundHeight >= 0 && s_boundHeight <= img.height / 2 && s_gapWidth >= 0 &&
-            s_gapHeight >= 0);
+           (FullImageGeometryUsable() && CanCutThirds(img.width, s_boundWidth) &&
+            CanCutThirds(img.height, s_boundHeight) && s_gapWidth >= 0 && s_gapHeight >= 0);
 }
 
 void SetMatchFrames(const NaviFrame_t& first, const NaviFrame_t& second) {
