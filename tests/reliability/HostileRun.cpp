@@ -1,6 +1,7 @@
 #include "HostileRun.h"
 
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -28,6 +29,7 @@ constexpr size_t kTwinBytes = size_t{1} << 20;       // what Twin holds
 constexpr size_t kAloneBytes = size_t{4096} * 4096;  // the largest image the module takes
 constexpr uint32_t kGain20 = 0x00020101U;
 constexpr uint32_t kGain2C = 0x00030201U;
+constexpr unsigned kHangSeconds = 600;  // of a process; the work of a pair is bounded far below
 
 // The raw frames of a gesture and its registers; the same for module and model.
 class Frames {
@@ -103,6 +105,7 @@ int Silence(void*, int, const char*, const char*, std::va_list) {
 
 // The same calls of the module alone; ends the process.
 [[noreturn]] void RunAloneAndExit(const ParamBlock& params, Mode mode, uint64_t seed) {
+    alarm(kHangSeconds);
     alog::SetSink(Silence, nullptr);
     Frames frames(params, seed, kAloneBytes);
     std::vector<uint8_t> image(kAloneBytes);
@@ -124,12 +127,15 @@ int Silence(void*, int, const char*, const char*, std::va_list) {
     _exit(0);
 }
 
-bool RunsAlone(const ParamBlock& params, Mode mode, uint64_t seed) {
+bool RunsAlone(const ParamBlock& params, Mode mode, uint64_t seed, int64_t* milliseconds) {
     const pid_t child = fork();
     if (child == 0)
         RunAloneAndExit(params, mode, seed);
     int status = 1;
-    return waitpid(child, &status, 0) == child && WIFEXITED(status) && WEXITSTATUS(status) == 0;
+    rusage used{};
+    const bool ended = wait4(child, &status, 0, &used) == child;
+    *milliseconds = used.ru_utime.tv_sec * 1000 + used.ru_utime.tv_usec / 1000;
+    return ended && WIFEXITED(status) && WEXITSTATUS(status) == 0;
 }
 
 }  // namespace
@@ -143,8 +149,8 @@ bool RunHostile(const ParamBlock& params, Mode mode, uint64_t seed, Reached* rea
         return !twin.Difference().has_value();
     }
     reached->alone = true;
-    const bool ran = RunsAlone(params, mode, seed);
-    EXPECT_TRUE(ran) << "the module alone crashed";
+    const bool ran = RunsAlone(params, mode, seed, &reached->aloneMs);
+    EXPECT_TRUE(ran) << "the module alone crashed, or never came back";
     return ran;
 }
 

@@ -11,6 +11,7 @@ namespace fpnavi_test {
 // How far the gesture of a block came.
 struct Reached {
     bool alone = false;     // too much for the model
+    int64_t aloneMs = 0;    // processor time of all its calls then
     bool centroid = false;  // a pair was counted
     bool noMove = false;    // the no-move test judged a pair
     bool match = false;     // template matching did

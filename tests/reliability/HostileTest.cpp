@@ -40,6 +40,7 @@ int64_t FromEnvironment(const char* name, int64_t otherwise) {
 struct Shares {
     int64_t blocks = 0;
     int64_t alone = 0;
+    int64_t slowestMs = 0;  // of those alone; printed, never judged
     int64_t centroid = 0;
     int64_t noMove = 0;
     int64_t match = 0;
@@ -48,6 +49,7 @@ struct Shares {
     void Add(const Reached& reached) {
         ++blocks;
         alone += reached.alone ? 1 : 0;
+        slowestMs = std::max(slowestMs, reached.aloneMs);
         centroid += reached.centroid ? 1 : 0;
         noMove += reached.noMove ? 1 : 0;
         match += reached.match ? 1 : 0;
@@ -57,9 +59,9 @@ struct Shares {
     void Print() const {
         std::printf(
             "%lld blocks: centroid and vote %d %%, no-move test %d %%, template match %d %%,"
-            " a key %d %%; in the module alone %d %%\n",
+            " a key %d %%; in the module alone %d %%, the slowest of them %lld ms\n",
             static_cast<long long>(blocks), Percent(centroid), Percent(noMove), Percent(match),
-            Percent(key), Percent(alone));
+            Percent(key), Percent(alone), static_cast<long long>(slowestMs));
     }
     // A counted pair and a vote in at least half of them.
     void ExpectDeep(Mode mode) const {

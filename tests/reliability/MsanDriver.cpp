@@ -2,13 +2,15 @@
 // every result that a host reads is looked at. C arrays only, so that no library without
 // instrumentation touches the data.
 //
-//   msan_driver BLOCKS
+//   msan_driver BLOCKS            sane and hostile blocks
+//   msan_driver --golden FILE     golden gestures, whose records are known
 #include <climits>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
 
 #include "FpNavi.h"
+#include "MsanGestures.h"
 #include "NaviParam.h"
 #include "ParamTable.h"
 #include "alog_host.h"
@@ -120,15 +122,7 @@ void RunGesture(int32_t mode) {
     SeeRecord();
 }
 
-}  // namespace
-
-int main(int argc, char** argv) {
-    const int32_t blocks = argc == 2 ? std::atoi(argv[1]) : 0;
-    if (blocks < 1) {
-        std::fprintf(stderr, "usage: msan_driver BLOCKS\n");
-        return 2;
-    }
-    alog::SetSink(SeeLine, nullptr);
+bool RunBlocks(int32_t blocks) {
     int32_t ran = 0;
     for (int32_t block = 0; block < blocks; ++block) {
         // Mode 2 in the second half only: the double scan stays on.
@@ -147,5 +141,20 @@ int main(int argc, char** argv) {
     std::printf("%d of %d blocks ran, %lld pairs counted, sum %lld\n", ran, blocks,
                 static_cast<long long>(s_pairs), static_cast<long long>(s_seen));
     // A pair a block at least: with fewer the methods have not been reached.
-    return s_pairs >= ran ? 0 : 1;
+    return s_pairs >= ran;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    alog::SetSink(SeeLine, nullptr);
+    // Not in one run: the double scan, once on, stays on.
+    if (argc == 3 && std::strcmp(argv[1], "--golden") == 0)
+        return ReplayGoldenGestures(argv[2]) ? 0 : 1;
+    const int32_t blocks = argc == 2 ? std::atoi(argv[1]) : 0;
+    if (blocks < 1) {
+        std::fprintf(stderr, "usage: msan_driver BLOCKS | --golden FILE\n");
+        return 2;
+    }
+    return RunBlocks(blocks) ? 0 : 1;
 }
