@@ -9,7 +9,6 @@
 #include "FindCandidate.h"
 #include "FingerNoMove.h"
 #include "ImgJoint.h"
-#include "JointSearch.h"
 #include "NaviFrame.h"
 #include "NaviParam.h"
 #include "PlacementDiffs.h"
@@ -268,15 +267,14 @@ int32_t PlainScore(int32_t di, int32_t dj) {
     return score;
 }
 
-JointOutcome CalcJoint() {
-    fpnavi::TemplateSet set;
-    const bool fast = fpnavi::CutTemplates(&set) && fpnavi::CanSearchJointly(set);
-    return {fpnavi::CalcImgJoint(), reference::CalcImgJoint(), fast};
-}
-
 bool IsTabulated() {
     fpnavi::TemplateSet set;
     return fpnavi::CutTemplates(&set) && fpnavi::CanTabulate(set);
+}
+
+JointOutcome CalcJoint() {
+    const bool fast = IsTabulated();
+    return {fpnavi::CalcImgJoint(), reference::CalcImgJoint(), fast};
 }
 
 }  // namespace fpnavi_test

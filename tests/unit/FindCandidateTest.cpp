@@ -37,6 +37,12 @@ TEST(MaxHeapify, IndexBeyondTheArrayIsFine) {
     EXPECT_EQ(keys, (std::vector<uint32_t>{1, 9}));
 }
 
+TEST(MaxHeapify, IndexBeforeTheArrayIsFine) {
+    std::vector<uint32_t> keys = {1, 9};
+    EXPECT_EQ(fpnavi::MaxHeapify(keys.data(), 2, -1), 0);
+    EXPECT_EQ(keys, (std::vector<uint32_t>{1, 9}));
+}
+
 TEST(MaxHeapify, SinksAlongTheLargerChildren) {
     std::vector<uint32_t> keys = {1, 9, 8, 7, 6, 5, 4};
     EXPECT_EQ(fpnavi::MaxHeapify(keys.data(), 7, 0), 0);
@@ -273,6 +279,40 @@ TEST_F(Candidates, TemplateWithoutAreaFails) {
         Params().Set("s_templateWidth", width).Apply();
         Find(frame, frame, -1);
     }
+}
+
+TEST_F(Candidates, TemplatesWithoutPixelsAreNotValid) {
+    // Two negative sides, -2 x -3 = 6 pixels, and one, 3 * -1431655765 = -2^32 + 1, which wraps to
+    // 1. A sentinel becomes 0 + 16 - (8 + 16) rows, 0 + 32 - ((56 - width) / 2 + 32) columns.
+    TestFrame frame(56, 36, 10, 1);
+    Params().Set("s_templateWidth", -2).Set("s_templateHeight", -3).Apply();
+    EXPECT_EQ(Find(frame, frame), Displacements(100, {-8, -29}));
+    Params().Set("s_templateWidth", 3).Set("s_templateHeight", -1431655765).Apply();
+    EXPECT_EQ(Find(frame, frame), Displacements(100, {-8, -26}));
+}
+
+TEST_F(Candidates, NowhereToWriteFails) {
+    Params().Apply();
+    TestFrame frame(56, 36, 10, 1);
+    Load(frame, frame);
+    std::vector<int32_t> entries(100, 7);
+    EXPECT_EQ(fpnavi::FindCandidate(nullptr, entries.data()), -1);
+    EXPECT_EQ(fpnavi::FindCandidate(entries.data(), nullptr), -1);
+    Params().Set("s_candidateNum", 0).Apply();
+    EXPECT_EQ(fpnavi::FindCandidate(entries.data(), entries.data()), -1);
+    EXPECT_EQ(entries, std::vector<int32_t>(100, 7));
+}
+
+TEST_F(Candidates, FrameWithoutPixelsFails) {
+    Params().Apply();
+    TestFrame frame(56, 36, 10, 1);
+    std::vector<int32_t> di(100);
+    std::vector<int32_t> dj(100);
+    ASSERT_EQ(ImgCopy(&s_imageCurr, frame.Get()), 0);
+    EXPECT_EQ(fpnavi::FindCandidate(di.data(), dj.data()), -1) << "no previous frame";
+    ImgClear(&s_imageCurr);
+    ASSERT_EQ(ImgCopy(&s_imagePrev, frame.Get()), 0);
+    EXPECT_EQ(fpnavi::FindCandidate(di.data(), dj.data()), -1) << "no current frame";
 }
 
 TEST_F(Candidates, TemplatesAndPlacementsOutsideTheFrameFail) {

@@ -89,6 +89,12 @@ TEST_F(StatusEntry, OtherModesTakeTheFpDetector) {
     }
 }
 
+TEST_F(StatusEntry, HgModeWithoutAnImageFails) {
+    Params().Set("s_modeFlag", 1).Set("s_blockWidthHg", 0).Apply();
+    EXPECT_EQ(Status(0), -1);
+    EXPECT_EQ(s_lastFrameFlag, 0);
+}
+
 TEST_F(StatusEntry, ImpossibleHgSizeFailsAndKeepsTheFlag) {
     Params().Set("s_modeFlag", 1).Apply();
     ASSERT_EQ(Status(255), 0);

@@ -1,6 +1,8 @@
 // GetFullImg: the nine tiles of a frame spread apart by the sensor's gaps.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <utility>
 #include <vector>
 
 #include "FailingMalloc.h"
@@ -189,6 +191,21 @@ TEST_F(FullImage, NegativeTileOrGapSizesFail) {
         params.Apply();
         EXPECT_EQ(GetFullImg(source.Get(), &m_full), -1);
         EXPECT_TRUE(IsEmpty(m_full));
+    }
+}
+
+TEST_F(FullImage, SidesOfMoreThan4096PixelsFail) {
+    // The full width is 56 + 2 * gap, the full height 36 + 2 * gap.
+    TestFrame source(56, 36, 9, 1);
+    for (const auto& [gap, largest] : {std::pair<const char*, int32_t>{"s_gapWidth", 2020},
+                                       std::pair<const char*, int32_t>{"s_gapHeight", 2030}}) {
+        Params().Set(gap, largest + 1).Apply();
+        EXPECT_EQ(GetFullImg(source.Get(), &m_full), -1) << gap;
+        EXPECT_TRUE(IsEmpty(m_full)) << gap;
+        Params().Set(gap, largest).Apply();
+        EXPECT_EQ(GetFullImg(source.Get(), &m_full), 0) << gap;
+        EXPECT_EQ(std::max(m_full.width, m_full.height), 4096) << gap;
+        ImgClear(&m_full);
     }
 }
 

@@ -341,6 +341,14 @@ TEST_F(ImgJointFailure, WorkingArraysAreFreed) {
     EXPECT_EQ(FailingMalloc::Live(), 0);
 }
 
+TEST_F(ImgJointFailure, NoRoomForCandidatesFailsThePair) {
+    Params().Apply();
+    Load();
+    Params().Set("s_candidateNum", 0).Apply();
+    EXPECT_EQ(CalcImgJoint(), -1);
+    ExpectNothingWritten();
+}
+
 TEST_F(ImgJointFailure, FailedCandidateSearchFailsThePair) {
     Params().Set("s_templateWidth", 0).Apply();
     Load();

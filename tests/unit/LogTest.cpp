@@ -87,4 +87,11 @@ TEST_F(Log, FunctionNameIsPaddedToFifteenColumns) {
     EXPECT_THAT(log.Lines()[0].text, ::testing::StartsWith("Voting         :0498:pid="));
 }
 
+TEST(HostLog, WithoutASinkLinesGoToStderr) {
+    ::testing::internal::CaptureStderr();
+    const int written = tq_log_printf(TQ_LOG_DEBUG, "TAG", "%d of %s\n", 3, "four");
+    EXPECT_EQ(::testing::internal::GetCapturedStderr(), "3 of four\n");
+    EXPECT_EQ(written, 10);
+}
+
 }  // namespace

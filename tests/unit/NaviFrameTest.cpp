@@ -188,6 +188,12 @@ TEST_F(NaviFrame, CopyOverAFilledFrameFreesItsBuffers) {
     EXPECT_EQ(FailingMalloc::Frees(), 2);
 }
 
+TEST_F(NaviFrame, CopyToNowhereFails) {
+    FillAndMark();
+    EXPECT_EQ(ImgCopy(nullptr, &m_frame), -1);
+    EXPECT_EQ(Bytes(m_frame.pData, kWidth * kHeight), m_image);
+}
+
 TEST_F(NaviFrame, CopyFromAnEmptySourceLeavesTheDestinationAsItWas) {
     FillAndMark();
     const NaviFrame_t empty{};

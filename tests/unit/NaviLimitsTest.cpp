@@ -166,6 +166,14 @@ TEST_F(PairWork, EndlessMatchRefinementFailsThePair) {
     EXPECT_EQ(PrintNaviLog()->calc_cnt, 0);
 }
 
+TEST_F(PairWork, WithoutFullImagesTheImageIsWhatIsMatched) {
+    // 65536 candidates on 56 x 36 pixels: 1.3e8 < 2^28
+    Params().Set("s_candidateNum", 65536).Set("s_multiBloclkFlag", 0).Apply();
+    EXPECT_TRUE(PairWorkAcceptable());
+    Params().Set("s_candidateNum", 65536).Apply();
+    EXPECT_FALSE(PairWorkAcceptable());
+}
+
 TEST_F(PairWork, ExtremeTolerancesDoNotOverflowTheEstimate) {
     Params params;
     params.Set("s_smallMoveTolRow", kMax).Set("s_smallMoveTolCol", kMax);

@@ -343,4 +343,15 @@ TEST_F(Driver, TwoIdenticalGesturesGiveIdenticalRecords) {
     EXPECT_EQ(std::memcmp(&records[0], &records[1], sizeof(records[0])), 0);
 }
 
+TEST_F(Driver, PairOfWhichOneFrameHasNoPixelsFails) {
+    Params().Apply();
+    TestFrame frame(56, 36, 10, 1);
+    ASSERT_EQ(ImgCopy(&s_imagePrev, frame.Get()), 0);
+    EXPECT_EQ(OrntCalcProcess(), -1) << "no current frame";
+    ImgClear(&s_imagePrev);
+    ASSERT_EQ(ImgCopy(&s_imageCurr, frame.Get()), 0);
+    EXPECT_EQ(OrntCalcProcess(), -1) << "no previous frame";
+    EXPECT_EQ(m_record->calc_cnt, 0);
+}
+
 }  // namespace

@@ -93,6 +93,15 @@ TEST_F(BiThr, LargestThresholdIs254) {
     EXPECT_EQ(result.scale, 1);
 }
 
+TEST_F(BiThr, TruncatedMeanOfOneClassCanBeatTwoClasses) {
+    // mean (0 + 4 + 255) / 4 = 64. t = 1: {0}: 64^2, {2, 2}: 2 * 62^2, 11784 together; t = 3:
+    // {0, 2, 2} of mean 4 / 3 = 1: 3 * 63^2 = 11907, against an empty class of mean 0.
+    TestFrame frame(4, Greys({{0, 1}, {2, 2}, {255, 1}}));
+    const Threshold result = ThresholdOf(frame);
+    EXPECT_EQ(result.thr, 3);
+    EXPECT_EQ(result.scale, 1);
+}
+
 TEST_F(BiThr, RefusesNullPointersAndEmptyFrames) {
     TestFrame frame(4, 4, 3);
     const NaviFrame_t good = *frame.Get();

@@ -227,6 +227,13 @@ TEST_F(Tune, SaturatedIsBelow10AndAbove250InMeanAndTop) {
     EXPECT_EQ(saturated(Flat(251)), 1);
     // Top 255, mean 20 * 255 / 126 = 40. With 0..1 percent one pixel is the top; 255 / 126 = 2.
     EXPECT_EQ(saturated(FlatWithBright(0, 20)), 0);
+    // 18 pixels of 60 in each corner: the top is the 13th to 18th, mean 18 * 60 / 126 = 8.
+    TestFrame dark(56, 36, 0);
+    for (const int32_t column : {0, 42})
+        dark.Paint(0, column, 2, 9, 60).Paint(27, column, 2, 9, 60);
+    EXPECT_EQ(saturated(dark.Greys()), 0) << "the top is inside";
+    EXPECT_EQ(_NAVI_mean, 8U);
+    EXPECT_EQ(_NAVI_top_mean, 60U);
     Params()
         .Set("_NAVI_top_mean_interval.RANGE_LOW", 0)
         .Set("_NAVI_top_mean_interval.RANGE_HIGH", 1)

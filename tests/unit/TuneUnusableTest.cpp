@@ -111,6 +111,17 @@ TEST_F(UnusableFrame, WidthOrHeightBelow1) {
     }
 }
 
+TEST_F(UnusableFrame, MorePixelsThan32BitsCount) {
+    // 65536 * 65536 = 2^32 wraps to 0, a multiple of 16.
+    Params()
+        .Set("s_blockWidthFp", 65536)
+        .Set("s_blockColNumFp", 1)
+        .Set("s_blockHeightFp", 65536)
+        .Set("s_blockRowNumFp", 1)
+        .Apply();
+    ExpectUnusable(0);
+}
+
 TEST_F(UnusableFrame, LowDcIsResetBeforeAnythingIsLookedAt) {
     Params().Set("_NAVI_blk_selection_mode", 9).Set("s_blockWidthFp", 0).Apply();
     m_registers.gain20 = 0xFFFFFFFFU;

@@ -95,6 +95,13 @@ TEST_F(FpVote, TinyCentroidTravelWithARestingPairIsNoMove) {
     EXPECT_EQ(Vote({CtOnly(2, 0), Resting()}), VKEY_NO_MOVE);
 }
 
+TEST_F(FpVote, MoveWhoseSharesWrapToNothingAbandonsTheVote) {
+    // (2^28 - 1)^2 + 1 = 2 - 2^29, times 10000 is 20000, both modulo 2^32: a length of 141. The
+    // components add up to 10000 * 2^28 = 625 * 2^32, which is 0.
+    m_params.Set("s_minDelta", 1);
+    EXPECT_EQ(Vote({FpOnly((1 << 28) - 1, 1)}), -1);
+}
+
 TEST_F(FpVote, NotMovedLimitsAreInclusive) {
     EXPECT_EQ(Vote({{10, 0, 9, 0, 0, VKEY_NONE}, Resting()}), VKEY_NO_MOVE);
     EXPECT_EQ(Vote({{10, 0, 10, 0, 0, VKEY_NONE}, Resting()}), VKEY_RIGHT);

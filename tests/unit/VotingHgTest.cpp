@@ -129,6 +129,16 @@ TEST_F(HgVote, CountRuleBelowTheSufficientCount) {
     EXPECT_EQ(Vote({1, 0}, {13, 0}, {r, r, r, r, r, n, n, n, n, n, n}), VKEY_RIGHT);  // 5 >= 5
 }
 
+TEST_F(HgVote, CountRuleHoldsForBothSensesOfAnAxis) {
+    m_params.Set("s_moveCntEffThr", 5).Set("s_moveCntMinThr", 2);
+    const int32_t l = VKEY_LEFT;
+    const int32_t d = VKEY_DOWN;
+    EXPECT_EQ(Vote({13, 0}, {1, 0}, {l, l, l}), VKEY_LEFT);
+    EXPECT_EQ(Vote({13, 0}, {1, 0}, {l, l}), VKEY_NO_MOVE);
+    EXPECT_EQ(Vote({0, 13}, {0, 1}, {d, d, d}), VKEY_DOWN);
+    EXPECT_EQ(Vote({0, 13}, {0, 1}, {d, d}), VKEY_NO_MOVE);
+}
+
 TEST_F(HgVote, UndecidedVerdictsAreNotCounted) {
     m_params.Set("s_moveCntEffThr", 5);
     const int32_t r = VKEY_RIGHT;
@@ -145,6 +155,13 @@ RC_GTEST_FIXTURE_PROP(HgVote, NeverNoneNorMinusOneAndTwiceTheSame, ()) {
     const int32_t key = Vote(first, last, verdicts);
     RC_ASSERT(key >= VKEY_UP && key <= VKEY_NO_MOVE);
     RC_ASSERT(Voting_hg_mode() == key);
+}
+
+TEST_F(HgVote, NumbersThatAreNoKeysAreNotCounted) {
+    for (const int32_t number : {-1, 6}) {
+        EXPECT_EQ(Vote({1, 1}, {21, 1}, {number}), VKEY_NO_MOVE) << number;
+        EXPECT_EQ(Vote({1, 1}, {21, 1}, {VKEY_RIGHT, number, number}), VKEY_RIGHT) << number;
+    }
 }
 
 }  // namespace

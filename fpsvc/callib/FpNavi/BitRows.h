@@ -12,9 +12,9 @@ namespace fpnavi {
 
 inline constexpr int32_t kWordPixels = 64;  // columns of a word, and rows of a small frame
 
-// Sides that the word-wide paths take.
+// Sides, of a frame with pixels, that the word-wide paths take.
 inline bool FitsWords(int32_t width, int32_t height) {
-    return width >= 1 && width <= kWordPixels && height >= 1 && height <= kWordPixels;
+    return width <= kWordPixels && height <= kWordPixels;
 }
 
 // The first count bits; 0 <= count <= 64.

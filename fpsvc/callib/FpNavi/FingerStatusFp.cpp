@@ -104,8 +104,7 @@ int32_t NavFingerDetectFp(const uint8_t* p_data) {
     int32_t blkMeanDiff = 0;
     int32_t greyRange = 0;
     GetBlkMeanDiff(p_data, &blkMeanDiff);
-    if (GetGreyRange(p_data, &greyRange) != 0)
-        return -1;
+    GetGreyRange(p_data, &greyRange);
     return pressedBlkNum > 0 || blkMeanDiff >= s_blkMeanDiffThreshold ||
                    greyRange >= s_rangeThreshold
                ? 1

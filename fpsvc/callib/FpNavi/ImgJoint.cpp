@@ -10,6 +10,7 @@
 #include "NaviMath.h"
 #include "NaviParam.h"
 #include "NaviVoteInfo.h"
+#include "PlacementDiffs.h"
 #include "TileMatch.h"
 
 namespace fpnavi {
@@ -96,7 +97,8 @@ JointResult Orient(const Match& match) {
             match.diff};
 }
 
-// Small frames: both steps in one. The full images are built all the same, for whoever reads them.
+// Small frames: both steps in one. The full images are built all the same, for whoever reads them;
+// so tiles that do not make up the frame are refused before they are matched.
 bool JoinSmall(const TemplateSet& set, JointResult* result) {
     uint32_t* const candidateList = AllocateCandidates<uint32_t>();
     const bool joined = candidateList != nullptr && (s_multiBloclkFlag != 1 || BuildFullImages());
@@ -108,9 +110,11 @@ bool JoinSmall(const TemplateSet& set, JointResult* result) {
 
 // Frames of any size: the candidate search, then the match.
 bool JoinAny(int32_t* candidate_i, int32_t* candidate_j, JointResult* result) {
-    return FindCandidate(candidate_i, candidate_j) == 0 &&
-           (s_multiBloclkFlag != 1 || BuildFullImages()) &&
-           FindMatch(candidate_i, candidate_j, &result->dx, &result->dy, &result->diff) == 0;
+    const bool joined = FindCandidate(candidate_i, candidate_j) == 0 &&
+                        (s_multiBloclkFlag != 1 || BuildFullImages());
+    if (joined)
+        FindMatch(candidate_i, candidate_j, &result->dx, &result->dy, &result->diff);
+    return joined;
 }
 
 }  // namespace
@@ -151,8 +155,8 @@ int32_t CalcImgJoint() {
     JointResult result = {0, 0, 0};
     bool joined = false;
     if (candidate_i != nullptr && candidate_j != nullptr && CutTemplates(&set))
-        joined = CanSearchJointly(set) ? JoinSmall(set, &result)
-                                       : JoinAny(candidate_i, candidate_j, &result);
+        joined =
+            CanTabulate(set) ? JoinSmall(set, &result) : JoinAny(candidate_i, candidate_j, &result);
     if (joined)
         RecordMatch(result.dx, result.dy, result.diff);
     std::free(candidate_i);

@@ -103,10 +103,6 @@ Best MatchAll(const TemplateSet& set, const uint32_t* candidateList) {
 
 }  // namespace
 
-bool CanSearchJointly(const TemplateSet& set) {
-    return CanTabulate(set) && CanMatchTiles(*set.cut);
-}
-
 Match SearchJointly(const TemplateSet& set, uint32_t* candidateList) {
     const PlacementDiffs* const tables = TabulatePlacements(set);
     SelectCandidates(tables, candidateList);
@@ -115,12 +111,12 @@ Match SearchJointly(const TemplateSet& set, uint32_t* candidateList) {
     if (best.unique)
         return {best.first, best.diff};
     RankCandidates(set, tables, candidateList);
-    for (int32_t m = 0; m < s_candidateNum; ++m) {
-        const Displacement displacement = DisplacementOf(set.tplts, candidateList[m]);
-        if (MatchAt(displacement, best.diff) == best.diff)
-            return {displacement, best.diff};
-    }
-    return {best.first, best.diff};  // not reached: the best one is among the candidates
+    // At least two of the candidates match best, so the first of them is not the last candidate.
+    const uint32_t* const first =
+        std::find_if(candidateList, candidateList + s_candidateNum - 1, [&](uint32_t key) {
+            return MatchAt(DisplacementOf(set.tplts, key), best.diff) == best.diff;
+        });
+    return {DisplacementOf(set.tplts, *first), best.diff};
 }
 
 }  // namespace fpnavi

@@ -15,11 +15,9 @@ struct Match {
     int32_t diff;
 };
 
-// The frames and templates of set are small enough.
-bool CanSearchJointly(const TemplateSet& set);
-
 // The best match of all candidates, between the frame that the templates are cut from and the
-// searched one. candidateList: s_candidateNum keys, the caller's, used as scratch.
+// searched one. set: one for which CanTabulate, of frames that SetMatchFrames takes. candidateList:
+// s_candidateNum keys, the caller's, used as scratch.
 Match SearchJointly(const TemplateSet& set, uint32_t* candidateList);
 
 }  // namespace fpnavi

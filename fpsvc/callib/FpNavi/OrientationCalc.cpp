@@ -97,9 +97,8 @@ int32_t OrntCalcProcess() {
     // The previous frame anew: a gesture's first frame has not been measured yet.
     if (GetCenterAndCoverage(&s_imagePrev) != 0 || GetCenterAndCoverage(&s_imageCurr) != 0)
         return -1;
-    if (s_doubleScanFlag == 1 &&
-        CalcDoubleScanMove(DoubleScanZonePrev, DoubleScanZoneCurr, &s_voteInfo) != 0)
-        return -1;
+    if (s_doubleScanFlag == 1)
+        CalcDoubleScanMove(DoubleScanZonePrev, DoubleScanZoneCurr, &s_voteInfo);
     if (CoversLess(s_coverageMinEff))
         return 0;
     CalcCenterMove(&s_imagePrev, &s_imageCurr, &s_voteInfo);

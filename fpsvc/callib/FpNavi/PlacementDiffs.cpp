@@ -79,8 +79,8 @@ struct Alike {
 void CollectAlike(const TemplateSet& set, int32_t k, Alike* alike) {
     alike->count = 0;
     for (int32_t other = k; other < kTpltMax; ++other) {
-        if (!set.valid[other] || set.tplts[other].width != set.tplts[k].width ||
-            set.tplts[other].height != set.tplts[k].height)
+        // All templates have the same two sides: those of one width are of one height.
+        if (!set.valid[other] || set.tplts[other].width != set.tplts[k].width)
             continue;
         alike->k[alike->count] = other;
         alike->packed[alike->count] = Pack(set.tplts[other], *set.cut);
@@ -140,7 +140,7 @@ void ScoreAlike(const TemplateSet& set, const Alike& alike, const uint8_t* image
 }
 
 int32_t CountOf(int64_t first, int64_t last) {
-    return last < first ? 0 : static_cast<int32_t>(last - first + 1);
+    return static_cast<int32_t>(last - first + 1);
 }
 
 void PrepareTable(const TemplateSet& set, int32_t k) {

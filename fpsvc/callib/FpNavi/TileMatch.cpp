@@ -3,7 +3,6 @@
 #include <algorithm>
 
 #include "MaskedFrame.h"
-#include "NaviLimits.h"
 #include "NaviParam.h"
 
 namespace fpnavi {
@@ -100,14 +99,6 @@ void ForEachPairing(Visit visit) {
 }
 
 }  // namespace
-
-bool CanMatchTiles(const NaviFrame_t& img) {
-    if (!FitsWords(img.width, img.height))
-        return false;
-    return s_multiBloclkFlag != 1 ||
-           (FullImageGeometryUsable() && CanCutThirds(img.width, s_boundWidth) &&
-            CanCutThirds(img.height, s_boundHeight) && s_gapWidth >= 0 && s_gapHeight >= 0);
-}
 
 void SetMatchFrames(const NaviFrame_t& first, const NaviFrame_t& second) {
     LayOut(first, &s_maskedFirst);

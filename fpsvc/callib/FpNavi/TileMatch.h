@@ -11,12 +11,9 @@
 
 namespace fpnavi {
 
-// Frames of img's size can be compared: they fit words, and with tiles are made up of nine of them.
-bool CanMatchTiles(const NaviFrame_t& img);
-
-// Takes the two frames to compare, of one size that CanMatchTiles. A pixel (row, column) of the
-// first will meet (row + di, column + dj) of the second, counted in the full images when there are
-// such.
+// Takes the two frames to compare, of one size that FitsWords, and that GetFullImg has taken when
+// there are full images. A pixel (row, column) of the first will meet (row + di, column + dj) of
+// the second, counted in the full images when there are such.
 void SetMatchFrames(const NaviFrame_t& first, const NaviFrame_t& second);
 
 inline constexpr int32_t kDiffWorst = 255;  // score of too little common finger area
