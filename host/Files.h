@@ -8,7 +8,8 @@
 
 namespace host {
 
-// The content of a file; Error when it cannot be read or is a directory.
+// The content of a file of at most 1 GiB, or of a pipe that has a writer. Error for one that cannot
+// be read, and for directories, devices and pipes without a writer, which are not waited for.
 std::vector<uint8_t> ReadWholeFile(const std::string& path);
 
 // Little-endian numbers at bytes; the caller has checked that they are there.

@@ -229,7 +229,8 @@ void ImportFng(const std::string& path, const std::function<void(Gesture&&)>& vi
         isDirectory ? FngFilesOf(path) : std::vector<std::string>{path};
     const std::string indexPath = (directory / kIndexName).string();
     std::map<std::string, FngIndexRow> rows;
-    if (std::filesystem::exists(indexPath, error)) {
+    // One that is there and cannot be read is an error, a link to nowhere too.
+    if (std::filesystem::exists(std::filesystem::symlink_status(indexPath, error))) {
         rows = ReadFngIndex(indexPath);
     }
     for (const std::string& file : files) {

@@ -3,6 +3,8 @@
 
 #include <fmt/format.h>
 
+#include <cstring>
+
 #include "Error.h"
 
 namespace host {
@@ -45,7 +47,16 @@ int64_t Database::Number(const char* sql, const char* doing) const {
 }
 
 void Database::Fail(const std::string& doing) const {
-    throw Error(m_path, "", fmt::format("cannot {}: {}", doing, sqlite3_errmsg(m_handle)));
+    std::string reason = sqlite3_errmsg(m_handle);
+    const int primary = sqlite3_errcode(m_handle) & 0xFF;
+    const int systemError = sqlite3_system_errno(m_handle);
+    if ((primary == SQLITE_IOERR || primary == SQLITE_CANTOPEN) && systemError != 0) {
+        reason += fmt::format(" ({})", std::strerror(systemError));
+    }
+    if (primary == SQLITE_CORRUPT) {
+        reason += ", expected a sound SQLite file";
+    }
+    throw Error(m_path, "", fmt::format("cannot {}: {}", doing, reason));
 }
 
 Statement::Statement(const Database& database, const char* sql, const char* doing)
@@ -136,19 +147,23 @@ void Statement::FailRow(const std::string& problem) const {
 }
 
 Transaction::Transaction(Database& database, const char* doing)
-    : m_database(database), m_doing(doing) {
-    m_database.Execute("BEGIN IMMEDIATE", doing);
+    : m_database(database),
+      m_doing(doing),
+      m_nested(sqlite3_get_autocommit(database.Handle()) == 0) {
+    m_database.Execute(m_nested ? "SAVEPOINT nested" : "BEGIN IMMEDIATE", doing);
 }
 
 Transaction::~Transaction() {
     // Some failures (a full disk) have rolled back already; then there is nothing to end.
     if (m_open && sqlite3_get_autocommit(m_database.Handle()) == 0) {
-        sqlite3_exec(m_database.Handle(), "ROLLBACK", nullptr, nullptr, nullptr);
+        sqlite3_exec(m_database.Handle(),
+                     m_nested ? "ROLLBACK TO nested; RELEASE nested" : "ROLLBACK", nullptr, nullptr,
+                     nullptr);
     }
 }
 
 void Transaction::Commit() {
-    m_database.Execute("COMMIT", m_doing);
+    m_database.Execute(m_nested ? "RELEASE nested" : "COMMIT", m_doing);
     m_open = false;
 }
 

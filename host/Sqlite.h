@@ -88,7 +88,8 @@ class Statement {
     sqlite3_stmt* m_handle = nullptr;
 };
 
-// BEGIN IMMEDIATE; rolled back unless committed.
+// BEGIN IMMEDIATE; rolled back unless committed. Within another transaction of the connection it is
+// a part of that one, which can be taken back alone.
 class Transaction {
   public:
     Transaction(Database& database, const char* doing);
@@ -101,6 +102,7 @@ class Transaction {
   private:
     Database& m_database;
     const char* m_doing;
+    bool m_nested;
     bool m_open = true;
 };
 

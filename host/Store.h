@@ -15,6 +15,7 @@
 namespace host {
 
 class Database;
+class Transaction;
 
 // One open store. Every member function throws Error with the file's name; an Append that throws
 // leaves the store as it was. Use one Store from one thread; several processes may open the same
@@ -23,14 +24,15 @@ class Store {
   public:
     enum class IfExists {
         Fail,     // a file of that name is an error
-        Replace,  // a store (or an empty file) of that name is deleted; anything else is an error
+        Replace,  // a store (or an empty file) of that name is replaced; anything else is an error
     };
 
-    // A new store, open for appending.
+    // A new store, open for appending. A kill at any moment leaves what was there before, or the
+    // new store.
     static Store Create(const std::string& path, IfExists ifExists = IfExists::Fail);
 
     // An existing one. Error for a file that is missing, empty, truncated, no SQLite file, another
-    // program's database or of a newer schema.
+    // program's database or of a newer schema. Appending brings an older schema to this one.
     static Store OpenForReading(const std::string& path);
     static Store OpenForAppending(const std::string& path);
 
@@ -43,9 +45,24 @@ class Store {
     // taken and for a gesture that CheckGesture refuses.
     void Append(const Gesture& gesture);
 
+    // Gestures that go in together: what is appended while it lives is there after its Commit, or
+    // not at all. Other processes that append wait for it.
+    class Batch {
+      public:
+        explicit Batch(Store& store);  // store must outlive it
+        ~Batch();
+        Batch(const Batch&) = delete;
+        Batch& operator=(const Batch&) = delete;
+
+        void Commit();
+
+      private:
+        std::unique_ptr<Transaction> m_transaction;
+    };
+
     int64_t Count() const;
 
-    // In the order of appending.
+    // In the order of appending; Error when the index of the ids has another number.
     std::vector<std::string> Ids() const;
 
     bool Contains(const std::string& id) const;

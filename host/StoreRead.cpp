@@ -5,6 +5,7 @@
 #include <nlohmann/json.hpp>
 
 #include "Error.h"
+#include "GestureChecksum.h"
 #include "Keys.h"
 #include "Store.h"
 #include "StoreSchema.h"
@@ -18,13 +19,16 @@ constexpr int64_t kInt32Max = std::numeric_limits<int32_t>::max();
 constexpr int64_t kUint32Max = std::numeric_limits<uint32_t>::max();
 
 // The columns that GestureFromRow reads, in its order.
-#define FPNAVI_GESTURE_COLUMNS                                                               \
+#define FPNAVI_GESTURE_COLUMNS(checksum)                                                     \
     "SELECT g.seq, g.id, p.params, g.mode, g.block_width, g.block_height, g.block_col_num, " \
     "g.block_row_num, g.frame_count, g.end, g.label, g.accepted, g.tier, g.tags, "           \
-    "g.library_version, g.notes FROM gesture g LEFT JOIN param_block p ON p.id = g.param_block "
+    "g.library_version, g.notes, " checksum                                                  \
+    " FROM gesture g LEFT JOIN param_block p ON p.id = g.param_block "
 
-constexpr const char* kReadOne = FPNAVI_GESTURE_COLUMNS "WHERE g.id = ?";
-constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS "ORDER BY g.seq";
+constexpr const char* kReadOne = FPNAVI_GESTURE_COLUMNS("g.checksum") "WHERE g.id = ?";
+constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS("g.checksum") "ORDER BY g.seq";
+constexpr const char* kReadOneOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "WHERE g.id = ?";
+constexpr const char* kReadAllOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "ORDER BY g.seq";
 #undef FPNAVI_GESTURE_COLUMNS
 
 constexpr const char* kReadFrames =
@@ -122,6 +126,38 @@ void ReadFrames(const Database& database, int64_t seq, int64_t count, Gesture& g
     }
 }
 
+// Both numbers in one statement, so that no other process can append between them.
+constexpr const char* kCountTwice =
+    "SELECT (SELECT count(*) FROM gesture NOT INDEXED), "
+    "(SELECT count(*) FROM gesture INDEXED BY sqlite_autoindex_gesture_1)";
+
+// A damaged page can take rows with it; the index of the ids then still has them.
+void CheckNoneIsMissing(const Database& database) {
+    Statement row(database, kCountTwice, "count the gestures");
+    row.Step();
+    const int64_t rows = row.Integer(0, 0, INT64_MAX);
+    const int64_t ids = row.Integer(1, 0, INT64_MAX);
+    if (rows != ids) {
+        throw Error(
+            database.Path(), "table gesture",
+            fmt::format("{} rows, expected {} as its index has: the file is damaged", rows, ids));
+    }
+}
+
+void CheckChecksum(const Statement& row, int column, const Gesture& gesture) {
+    if (row.IsNull(column)) {
+        return;
+    }
+    const int64_t stored = row.Integer(column, 0, kUint32Max);
+    const uint32_t computed = GestureChecksum(gesture);
+    if (stored != computed) {
+        row.FailRow(
+            fmt::format("its content has checksum {:#010x}, expected {:#010x} as stored: "
+                        "damaged, or changed by another program",
+                        computed, stored));
+    }
+}
+
 Gesture GestureFromRow(const Database& database, Statement& row) {
     Gesture gesture;
     row.At(fmt::format("gesture row {}", row.Integer(0, INT64_MIN, INT64_MAX)));
@@ -138,6 +174,8 @@ Gesture GestureFromRow(const Database& database, Statement& row) {
     ReadFrames(database, row.Integer(0, INT64_MIN, INT64_MAX), row.Integer(8, 0, kInt32Max),
                gesture);
     CheckGesture(gesture, database.Path());
+    row.At(place);
+    CheckChecksum(row, 16, gesture);
     return gesture;
 }
 
@@ -174,6 +212,7 @@ int64_t Store::Count() const {
 }
 
 std::vector<std::string> Store::Ids() const {
+    CheckNoneIsMissing(*m_database);
     Statement row(*m_database, "SELECT id FROM gesture ORDER BY seq", "list the gestures");
     std::vector<std::string> ids;
     while (row.Step()) {
@@ -189,7 +228,8 @@ bool Store::Contains(const std::string& id) const {
 }
 
 Gesture Store::Read(const std::string& id) const {
-    Statement row(*m_database, kReadOne, "read the gesture");
+    const bool sums = StoreVersion(*m_database) > kStoreSchemaWithoutChecksums;
+    Statement row(*m_database, sums ? kReadOne : kReadOneOfVersion1, "read the gesture");
     row.At(GesturePlace(id));
     row.Bind(1, id);
     if (!row.Step()) {
@@ -199,7 +239,9 @@ Gesture Store::Read(const std::string& id) const {
 }
 
 void Store::ForEach(const std::function<void(const Gesture&)>& visit) const {
-    Statement row(*m_database, kReadAll, "read the gestures");
+    CheckNoneIsMissing(*m_database);
+    const bool sums = StoreVersion(*m_database) > kStoreSchemaWithoutChecksums;
+    Statement row(*m_database, sums ? kReadAll : kReadAllOfVersion1, "read the gestures");
     while (row.Step()) {
         visit(GestureFromRow(*m_database, row));
         row.At("");

@@ -20,7 +20,7 @@ namespace host {
 namespace {
 
 // Names instead of numbers wherever a person may look with a SQLite shell. A parameter block is
-// stored once for all gestures that share it.
+// stored once for all gestures that share it. The checksum is null where nobody has made one.
 constexpr const char* kTables = R"(
 CREATE TABLE param_block (
     id     INTEGER PRIMARY KEY,
@@ -42,7 +42,8 @@ CREATE TABLE gesture (
     tier            TEXT NOT NULL,
     tags            TEXT NOT NULL,
     library_version TEXT NOT NULL,
-    notes           TEXT NOT NULL
+    notes           TEXT NOT NULL,
+    checksum        INTEGER
 );
 CREATE TABLE frame (
     gesture     INTEGER NOT NULL REFERENCES gesture (seq) ON DELETE CASCADE,
@@ -138,10 +139,11 @@ void CheckIdentity(const Database& database) {
                                 "expected {:#x} of a recording store)",
                                 application, kStoreApplicationId));
     }
-    const int64_t version = database.Number("PRAGMA user_version", "read the schema version");
-    if (version != kStoreSchemaVersion) {
+    const int64_t version = StoreVersion(database);
+    if (version < kStoreSchemaWithoutChecksums || version > kStoreSchemaVersion) {
         throw Error(database.Path(), "",
-                    fmt::format("schema version {}, expected {}{}", version, kStoreSchemaVersion,
+                    fmt::format("schema version {}, expected {} to {}{}", version,
+                                kStoreSchemaWithoutChecksums, kStoreSchemaVersion,
                                 version > kStoreSchemaVersion
                                     ? ": written by a newer version of this program"
                                     : ""));
@@ -176,8 +178,36 @@ void CreateSchema(Database& database) {
     transaction.Commit();
 }
 
+int64_t StoreVersion(const Database& database) {
+    return database.Number("PRAGMA user_version", "read the schema version");
+}
+
+void UpgradeSchema(Database& database) {
+    if (StoreVersion(database) != kStoreSchemaWithoutChecksums) {
+        return;
+    }
+    constexpr const char* kDoing = "add the checksums";
+    Transaction transaction(database, kDoing);
+    // Asked again within the transaction: another process may have done it meanwhile.
+    if (StoreVersion(database) == kStoreSchemaWithoutChecksums) {
+        database.Execute(
+            fmt::format("ALTER TABLE gesture ADD COLUMN checksum INTEGER; PRAGMA user_version = {}",
+                        kStoreSchemaVersion)
+                .c_str(),
+            kDoing);
+    }
+    transaction.Commit();
+}
+
 std::unique_ptr<Database> OpenStoreFile(const std::string& path, bool forAppending) {
     CheckFileStart(path);
+    std::error_code ignored;
+    if (!forAppending && std::filesystem::exists(path + "-journal", ignored)) {
+        // A writer was killed while it changed the kind of its journal; only a connection that may
+        // write can take back what it left.
+        Database(path, SQLITE_OPEN_READWRITE)
+            .Number("PRAGMA schema_version", "take back what a killed writer left in its -journal");
+    }
     auto database = std::make_unique<Database>(
         path, forAppending ? SQLITE_OPEN_READWRITE : SQLITE_OPEN_READONLY);
     CheckIdentity(*database);

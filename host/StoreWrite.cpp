@@ -1,13 +1,10 @@
-// Creating a store and appending to it.
+// Appending to a store.
 #include <fmt/format.h>
 
-#include <cerrno>
-#include <cstdio>
-#include <cstring>
-#include <filesystem>
 #include <nlohmann/json.hpp>
 
 #include "Error.h"
+#include "GestureChecksum.h"
 #include "Keys.h"
 #include "Store.h"
 #include "StoreSchema.h"
@@ -15,57 +12,6 @@
 namespace host {
 
 namespace {
-
-// Each commit is one flush of the write-ahead log; without synchronous FULL the last gestures could
-// be lost with the power. Where the log is not possible (some network file systems), SQLite keeps
-// its rollback journal, which is as safe and slower.
-void PrepareForAppending(Database& database) {
-    database.Execute("PRAGMA foreign_keys = ON; PRAGMA synchronous = FULL",
-                     "set up the connection");
-    sqlite3_exec(database.Handle(), "PRAGMA journal_mode = WAL", nullptr, nullptr, nullptr);
-}
-
-void RemoveStoreFiles(const std::string& path) {
-    for (const char* suffix : {"", "-wal", "-shm", "-journal"}) {
-        std::error_code error;
-        std::filesystem::remove(path + suffix, error);
-        if (error) {
-            throw Error(path + suffix, "", "cannot be deleted: " + error.message());
-        }
-    }
-}
-
-bool IsEmptyFile(const std::string& path) {
-    std::error_code error;
-    return std::filesystem::is_regular_file(path, error) &&
-           std::filesystem::file_size(path, error) == 0 && !error;
-}
-
-void RemoveFormer(const std::string& path) {
-    std::error_code error;
-    if (!std::filesystem::exists(path, error)) {
-        return;
-    }
-    if (!IsEmptyFile(path)) {
-        try {
-            OpenStoreFile(path, false);
-        } catch (const Error& reason) {
-            throw Error(path, "",
-                        std::string("will not be replaced, only a recording store is (") +
-                            reason.what() + ")");
-        }
-    }
-    RemoveStoreFiles(path);
-}
-
-// Fails when the file exists, also when another process creates it at the same moment.
-void CreateEmptyFile(const std::string& path) {
-    std::FILE* const file = std::fopen(path.c_str(), "wbx");
-    if (file == nullptr) {
-        throw Error(path, "", std::string("cannot be created: ") + std::strerror(errno));
-    }
-    std::fclose(file);
-}
 
 std::string JsonList(const std::vector<std::string>& texts, const std::string& file,
                      const std::string& place) {
@@ -105,7 +51,8 @@ int64_t StoreGestureRow(const Database& database, const Gesture& gesture, int64_
     Statement insert(database,
                      "INSERT INTO gesture (id, param_block, mode, block_width, block_height, "
                      "block_col_num, block_row_num, frame_count, end, label, accepted, tier, tags, "
-                     "library_version, notes) VALUES (?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?)",
+                     "library_version, notes, checksum) "
+                     "VALUES (?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?)",
                      "store the gesture");
     insert.At(place);
     insert.Bind(1, gesture.id);
@@ -127,6 +74,7 @@ int64_t StoreGestureRow(const Database& database, const Gesture& gesture, int64_
     insert.Bind(13, tags);
     insert.Bind(14, gesture.libraryVersion);
     insert.Bind(15, gesture.notes);
+    insert.Bind(16, GestureChecksum(gesture));
     insert.Step();
     return sqlite3_last_insert_rowid(database.Handle());
 }
@@ -154,15 +102,13 @@ void StoreFrames(const Database& database, const Gesture& gesture, int64_t gestu
 
 }  // namespace
 
-Store Store::Create(const std::string& path, IfExists ifExists) {
-    if (ifExists == IfExists::Replace) {
-        RemoveFormer(path);
-    }
-    CreateEmptyFile(path);
-    auto database = std::make_unique<Database>(path, SQLITE_OPEN_READWRITE);
-    CreateSchema(*database);
-    PrepareForAppending(*database);
-    return Store(std::move(database), true);
+// Each commit is one flush of the write-ahead log; without synchronous FULL the last gestures could
+// be lost with the power. Where the log is not possible (some network file systems), SQLite keeps
+// its rollback journal, which is as safe and slower.
+void PrepareForAppending(Database& database) {
+    database.Execute("PRAGMA foreign_keys = ON; PRAGMA synchronous = FULL",
+                     "set up the connection");
+    sqlite3_exec(database.Handle(), "PRAGMA journal_mode = WAL", nullptr, nullptr, nullptr);
 }
 
 Store Store::OpenForAppending(const std::string& path) {
@@ -171,7 +117,17 @@ Store Store::OpenForAppending(const std::string& path) {
         throw Error(path, "", "cannot be written, expected a file with write permission");
     }
     PrepareForAppending(*database);
+    UpgradeSchema(*database);
     return Store(std::move(database), true);
+}
+
+Store::Batch::Batch(Store& store)
+    : m_transaction(std::make_unique<Transaction>(*store.m_database, "store the gestures")) {}
+
+Store::Batch::~Batch() = default;
+
+void Store::Batch::Commit() {
+    m_transaction->Commit();
 }
 
 void Store::Append(const Gesture& gesture) {

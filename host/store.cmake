@@ -4,6 +4,7 @@ set(FPNAVI_STORE_SOURCES
         Files.cpp
         FngImport.cpp
         FngIndex.cpp
+        GestureChecksum.cpp
         Keys.cpp
         ParamFile.cpp
         ParamTable.cpp
@@ -11,6 +12,7 @@ set(FPNAVI_STORE_SOURCES
         Redact.cpp
         Sqlite.cpp
         StoreCheck.cpp
+        StoreCreate.cpp
         StoreRead.cpp
         StoreSchema.cpp
         StoreWrite.cpp)

@@ -22,9 +22,8 @@ namespace host_test {
 // A directory of this process, deleted when it ends.
 class ProcessDirectory {
   public:
-    ProcessDirectory()
-        : m_path(std::filesystem::path(::testing::TempDir()) /
-                 ("fpnavi-" + std::to_string(::getpid()))) {
+    explicit ProcessDirectory(const std::string& parent)
+        : m_path(std::filesystem::path(parent) / ("fpnavi-" + std::to_string(::getpid()))) {
         std::filesystem::create_directories(m_path);
     }
     ~ProcessDirectory() {
@@ -42,9 +41,19 @@ class ProcessDirectory {
 
 // A fresh directory of the running test.
 inline std::string TestDirectory() {
-    static const ProcessDirectory root;
+    static const ProcessDirectory root(::testing::TempDir());
     static int counter = 0;
     const std::filesystem::path directory = root.Path() / std::to_string(counter++);
+    std::filesystem::create_directories(directory);
+    return directory.string();
+}
+
+// One in memory where there is such a file system: for thousands of small files, or of flushes.
+inline std::string MemoryDirectory() {
+    const char* const memory = "/dev/shm";
+    static const ProcessDirectory root(::access(memory, W_OK) == 0 ? memory : ::testing::TempDir());
+    static int counter = 0;
+    const std::filesystem::path directory = root.Path() / ("m" + std::to_string(counter++));
     std::filesystem::create_directories(directory);
     return directory.string();
 }

@@ -10,6 +10,7 @@
 #include <utility>
 
 #include "HostTestSupport.h"
+#include "ProcessSupport.h"
 #include "Store.h"
 #include "StoreTestSupport.h"
 
@@ -19,10 +20,12 @@ using host::Gesture;
 using host::Store;
 using host_test::ErrorOf;
 using host_test::ExpectSameGesture;
+using host_test::InChild;
 using host_test::NumberIn;
 using host_test::ReadBytes;
 using host_test::RunSql;
 using host_test::SmallGesture;
+using host_test::StatusOf;
 using host_test::StoreOf;
 using host_test::TestDirectory;
 using host_test::WriteBytes;
@@ -61,10 +64,10 @@ TEST(StoreOpen, DatabaseOfAnotherProgramIsRefused) {
 
 TEST(StoreOpen, OtherSchemaVersionsAreRefused) {
     const std::string path = StoreOf({SmallGesture("a")});
-    RunSql(path, "PRAGMA user_version = 2");
-    EXPECT_THAT(OpenError(path), HasSubstr("schema version 2, expected 1: written by a newer"));
+    RunSql(path, "PRAGMA user_version = 3");
+    EXPECT_THAT(OpenError(path), HasSubstr("version 3, expected 1 to 2: written by a newer"));
     RunSql(path, "PRAGMA user_version = 0");
-    EXPECT_THAT(OpenError(path), HasSubstr("schema version 0, expected 1"));
+    EXPECT_THAT(OpenError(path), HasSubstr("schema version 0, expected 1 to 2"));
 }
 
 TEST(StoreOpen, MissingTableIsRefused) {
@@ -167,22 +170,6 @@ TEST(StoreDamage, AbortedAppendLeavesNothing) {
     store.Append(SmallGesture("c", 2));
     EXPECT_THAT(store.Ids(), ElementsAre("a", "c"));
     EXPECT_EQ(NumberIn(path, "SELECT count(*) FROM frame"), 3 + 2);
-}
-
-// Runs action in a child process; its result is the exit code.
-template <typename Action>
-pid_t InChild(Action action) {
-    const pid_t child = fork();
-    if (child == 0) {
-        _exit(action());
-    }
-    return child;
-}
-
-int StatusOf(pid_t child) {
-    int status = 0;
-    EXPECT_EQ(waitpid(child, &status, 0), child);
-    return status;
 }
 
 // The ids g0, g1, ... without gaps, each complete. Returns their number.

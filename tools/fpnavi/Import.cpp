@@ -30,9 +30,13 @@ struct Options {
     bool json = false;
 };
 
+bool Exists(const std::string& path) {
+    std::error_code ignored;  // Create says what is wrong with a path that cannot be followed
+    return std::filesystem::exists(path, ignored);
+}
+
 host::Store OpenOrCreate(const std::string& path) {
-    return std::filesystem::exists(path) ? host::Store::OpenForAppending(path)
-                                         : host::Store::Create(path);
+    return Exists(path) ? host::Store::OpenForAppending(path) : host::Store::Create(path);
 }
 
 void Report(const Options& options, int64_t gestures, int64_t frames, const host::Store& store) {
@@ -51,7 +55,7 @@ void Report(const Options& options, int64_t gestures, int64_t frames, const host
 // corpus as it was. Returns their number.
 int64_t CheckPaths(const Options& options) {
     std::set<std::string> ids;
-    if (std::filesystem::exists(options.corpus)) {
+    if (Exists(options.corpus)) {
         for (std::string& id : host::Store::OpenForReading(options.corpus).Ids())
             ids.insert(std::move(id));
     }
@@ -73,6 +77,8 @@ int RunFng(const Options& options) {
     host::Store store = OpenOrCreate(options.corpus);
     int64_t frames = 0;
     {
+        // All or nothing: after a kill or a full disk the same command can be run again.
+        host::Store::Batch batch(store);
         Progress progress("imported", count, true);
         for (const std::string& path : options.paths) {
             host::ImportFng(path, [&](host::Gesture&& gesture) {
@@ -81,6 +87,7 @@ int RunFng(const Options& options) {
                 progress.Step();
             });
         }
+        batch.Commit();
     }
     Report(options, count, frames, store);
     return kFine;

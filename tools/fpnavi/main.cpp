@@ -1,6 +1,7 @@
 // fpnavi: records of finger gestures made, imported, replayed and explained.
 #include <fmt/core.h>
 
+#include <csignal>
 #include <exception>
 
 #include "Commands.h"
@@ -44,6 +45,8 @@ int Run(int argc, char** argv) {
 
 int main(int argc, char** argv) {
     command::GuardStandardStreams();
+    // A limit on the size of files is an error that is told, as a full disk is.
+    std::signal(SIGXFSZ, SIG_IGN);
     int code = command::kBadInput;
     try {
         code = Run(argc, argv);

@@ -1,0 +1,160 @@
+// The checksum of a gesture: what it covers, what a store tells with it, and stores of the version
+// before, which have none.
+#include <gmock/gmock.h>
+
+#include "GestureChecksum.h"
+#include "HostTestSupport.h"
+#include "Store.h"
+#include "StoreTestSupport.h"
+
+namespace {
+
+using host::Gesture;
+using host::GestureChecksum;
+using host::Store;
+using host_test::ErrorOf;
+using host_test::ExpectSameGesture;
+using host_test::NumberIn;
+using host_test::RunSql;
+using host_test::SmallGesture;
+using host_test::StoreOf;
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+using ::testing::StartsWith;
+
+Gesture GestureOfAllFields() {
+    Gesture gesture;
+    gesture.id = "a";
+    gesture.frames.resize(1);
+    gesture.frames[0].raw = {1, 2, 3};
+    gesture.frames[0].reg24 = 7;
+    gesture.frames[0].reg28 = 8;
+    gesture.frames[0].x16 = -1;
+    gesture.frames[0].presence = host::Presence::Sliver;
+    gesture.end = host::GestureEnd::TimeOut;
+    gesture.label = 2;
+    gesture.accepted = {2, 0};
+    gesture.tier = "core";
+    gesture.tags = {"t"};
+    gesture.libraryVersion = "1";
+    gesture.notes = "n";
+    return gesture;
+}
+
+// The values are those of Python's zlib.crc32 over the fields as the header describes them: numbers
+// of eight bytes, lowest first, and lengths before texts and lists.
+TEST(GestureChecksum, IsTheCrc32OfTheFields) {
+    Gesture empty;
+    empty.id = "a";
+    EXPECT_EQ(GestureChecksum(empty), 0xA1070E5DU);
+    EXPECT_EQ(GestureChecksum(GestureOfAllFields()), 0x3B203021U);
+}
+
+TEST(GestureChecksum, ChangesWithEveryField) {
+    const auto change = [](void (*field)(Gesture&)) {
+        Gesture gesture = GestureOfAllFields();
+        field(gesture);
+        EXPECT_NE(GestureChecksum(gesture), GestureChecksum(GestureOfAllFields()));
+    };
+    change([](Gesture& g) { g.id = "b"; });
+    change([](Gesture& g) { g.params[77] = 1; });
+    change([](Gesture& g) { g.frames[0].raw[2] ^= 0x80; });
+    change([](Gesture& g) { g.frames[0].reg24 = 6; });
+    change([](Gesture& g) { g.frames[0].reg28 ^= 0x80000000U; });
+    change([](Gesture& g) { g.frames[0].x16.reset(); });
+    change([](Gesture& g) { g.frames[0].y16 = 0; });
+    change([](Gesture& g) { g.frames[0].presence = host::Presence::Absent; });
+    change([](Gesture& g) { g.frames.push_back(g.frames[0]); });
+    change([](Gesture& g) { g.end = host::GestureEnd::Lift; });
+    change([](Gesture& g) { g.label.reset(); });
+    change([](Gesture& g) { g.accepted = {2}; });
+    change([](Gesture& g) { g.tier = ""; });
+    change([](Gesture& g) { g.tags = {"t", ""}; });
+    change([](Gesture& g) { g.libraryVersion = ""; });
+    change([](Gesture& g) { g.notes = "m"; });
+}
+
+TEST(StoreChecksum, TellsTheGestureThatWasChanged) {
+    for (const char* sql :
+         {"UPDATE frame SET raw = zeroblob(2016) WHERE gesture = 2 AND frame_index = 1",
+          "UPDATE gesture SET label = 'UP' WHERE seq = 2",
+          "UPDATE gesture SET notes = 'other' WHERE seq = 2",
+          "UPDATE gesture SET checksum = (checksum + 1) & 4294967295 WHERE seq = 2"}) {
+        const std::string path = StoreOf({SmallGesture("a"), SmallGesture("b")});
+        RunSql(path, sql);
+        const Store store = Store::OpenForReading(path);
+        ExpectSameGesture(store.Read("a"), SmallGesture("a"));
+        EXPECT_THAT(ErrorOf([&] { store.Read("b"); }),
+                    StartsWith(path + ": gesture 'b': its content has checksum 0x"))
+            << sql;
+        EXPECT_THAT(ErrorOf([&] { store.ForEach([](const Gesture&) {}); }),
+                    HasSubstr("gesture 'b': its content has checksum"));
+    }
+}
+
+TEST(StoreChecksum, IsNotAskedForWhereThereIsNone) {
+    const std::string path = StoreOf({SmallGesture("a")});
+    RunSql(path, "UPDATE gesture SET label = 'UP', checksum = NULL");
+    EXPECT_EQ(Store::OpenForReading(path).Read("a").label, VKEY_UP);
+}
+
+TEST(StoreChecksum, OfAnotherKindIsRefused) {
+    const std::string path = StoreOf({SmallGesture("a")});
+    RunSql(path, "UPDATE gesture SET checksum = 'sum'");
+    EXPECT_THAT(ErrorOf([&] { Store::OpenForReading(path).Read("a"); }),
+                HasSubstr("gesture 'a': checksum has the wrong type, expected an integer"));
+    RunSql(path, "UPDATE gesture SET checksum = -1");
+    EXPECT_THAT(ErrorOf([&] { Store::OpenForReading(path).Read("a"); }),
+                HasSubstr("checksum is -1, expected 0 to 4294967295"));
+}
+
+// A page that says it has one row less takes the last gesture with it.
+TEST(StoreDamage, RowThatIsMissingIsTold) {
+    const std::string path = StoreOf({SmallGesture("a", 1), SmallGesture("b", 1)});
+    const int64_t page =
+        NumberIn(path, "SELECT rootpage FROM sqlite_schema WHERE name = 'gesture'");
+    std::vector<uint8_t> bytes = host_test::ReadBytes(path);
+    const auto cellCount = static_cast<size_t>((page - 1) * 4096 + 4);  // the low byte
+    ASSERT_EQ(bytes.at(cellCount), 2);
+    bytes[cellCount] = 1;
+    host_test::WriteBytes(path, bytes);
+    const Store store = Store::OpenForReading(path);
+    const std::string expected =
+        path + ": table gesture: 1 rows, expected 2 as its index has: the file is damaged";
+    EXPECT_EQ(ErrorOf([&] { store.Ids(); }), expected);
+    EXPECT_EQ(ErrorOf([&] { store.ForEach([](const Gesture&) {}); }), expected);
+}
+
+std::string StoreOfVersion1() {
+    const std::string path = StoreOf({SmallGesture("a"), SmallGesture("b")});
+    RunSql(path, "ALTER TABLE gesture DROP COLUMN checksum; PRAGMA user_version = 1");
+    return path;
+}
+
+TEST(StoreOfVersion1, IsReadAndNotChanged) {
+    const std::string path = StoreOfVersion1();
+    const std::vector<uint8_t> bytes = host_test::ReadBytes(path);
+    {
+        const Store store = Store::OpenForReading(path);
+        EXPECT_THAT(store.Ids(), ElementsAre("a", "b"));
+        ExpectSameGesture(store.Read("b"), SmallGesture("b"));
+        store.ForEach(
+            [](const Gesture& gesture) { ExpectSameGesture(gesture, SmallGesture(gesture.id)); });
+    }
+    EXPECT_EQ(host_test::ReadBytes(path), bytes);
+}
+
+TEST(StoreOfVersion1, BecomesVersion2WhenOpenedForAppending) {
+    const std::string path = StoreOfVersion1();
+    Store::OpenForAppending(path).Append(SmallGesture("c"));
+    EXPECT_EQ(NumberIn(path, "PRAGMA user_version"), 2);
+    EXPECT_EQ(NumberIn(path, "SELECT count(*) FROM gesture WHERE checksum IS NULL"), 2);
+    const Store store = Store::OpenForReading(path);
+    for (const char* id : {"a", "b", "c"}) {
+        ExpectSameGesture(store.Read(id), SmallGesture(id));
+    }
+    RunSql(path, "UPDATE frame SET reg24 = 1 WHERE gesture = 3");
+    EXPECT_THAT(ErrorOf([&] { store.Read("c"); }), HasSubstr("gesture 'c': its content has"));
+}
+
+}  // namespace
