@@ -65,8 +65,10 @@ void ReplaySimulatedKind(uint64_t test, Mode mode, int64_t percent) {
 // One call chosen at random, most of the time the next step of a gesture.
 void RandomStep(SimRandom& random, MovingPicture& picture, Mode mode) {
     Twin& twin = Twin::Get();
-    if (mode == Mode::DoubleScan || random.Chance(3))
-        twin.Zones(static_cast<uint32_t>(random.Next()), static_cast<uint32_t>(random.Next()));
+    if (mode == Mode::DoubleScan || random.Chance(3)) {
+        const auto reg24 = static_cast<uint32_t>(random.Next());  // first, with every compiler
+        twin.Zones(reg24, static_cast<uint32_t>(random.Next()));
+    }
     twin.SetImage(picture.Next());
     if (random.Chance(80))
         twin.Status(random.Chance(1));

@@ -83,8 +83,10 @@ Reached RunTwin(const ParamBlock& params, Mode mode, uint64_t seed) {
     twin.Clear();
     int32_t pairs = 0;
     for (int32_t frame = 0; frame < kFrames; ++frame) {
-        if (mode == Mode::DoubleScan)
-            twin.Zones(frames.Register(), frames.Register());
+        if (mode == Mode::DoubleScan) {
+            const uint32_t reg24 = frames.Register();  // drawn in this order with every compiler
+            twin.Zones(reg24, frames.Register());
+        }
         twin.Block(frames.Next(), fpnavi::s_imageWidth);
         twin.Frame(0);
         if (fpnavi::s_voteInfo.calc_cnt > pairs)
@@ -112,8 +114,10 @@ int Silence(void*, int, const char*, const char*, std::va_list) {
     ::SetNaviParam(params.data());
     ::FpNaviClear();
     for (int32_t frame = 0; frame < kFrames; ++frame) {
-        if (mode == Mode::DoubleScan)
-            ::GetDoubleScanNaviBlock(frames.Register(), frames.Register());
+        if (mode == Mode::DoubleScan) {
+            const uint32_t reg24 = frames.Register();
+            ::GetDoubleScanNaviBlock(reg24, frames.Register());
+        }
         ::GetNaviBlock(frames.Next().data(), fpnavi::s_imageWidth, 0, image.data());
         ::OrientationCalc(image.data(), image.data(), 0);
     }

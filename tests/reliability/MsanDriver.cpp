@@ -103,8 +103,10 @@ void RunGesture(int32_t mode) {
     const int32_t dy = Below(9) - 4;
     for (int32_t frame = 0; frame < kFrames; ++frame) {
         FillFrame(fpnavi::s_imageWidth, fpnavi::s_imageHeight, frame, dx, dy);
-        if (mode == 2)
-            See(GetDoubleScanNaviBlock(Random(), Random()));
+        if (mode == 2) {
+            const uint32_t reg24 = Random();
+            See(GetDoubleScanNaviBlock(reg24, Random()));
+        }
         See(GetNaviBlock(s_raw, fpnavi::s_imageWidth, fpnavi::s_imageHeight, s_image));
         See(OrientationCalc(s_image, s_image, 0));
     }
