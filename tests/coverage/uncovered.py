@@ -1,11 +1,12 @@
 #!/usr/bin/env python3
 """Lines, branches and conditions (MC/DC) that no test covers, from what llvm-cov exports.
 
-    uncovered.py --source DIR --exceptions FILE [--only NAME] EXPORT.json EXPORT.info
+    uncovered.py --source DIR... (--exceptions FILE | --figures) [--only NAME]... EXPORT.json EXPORT.info
 
 EXPORT.json and EXPORT.info are `llvm-cov export` of one build, the second with -format=lcov. Prints a
 line of figures for each file and one for each place that is not covered. Ends with 1 when such a place
-is not in the list of exceptions, or when an exception is covered after all.
+is not in the list of exceptions, or when an exception is covered after all. With --figures only the
+figures, and nothing is judged.
 
 A place that a template has several times counts as covered when one of them is; each of them must run.
 """
@@ -78,7 +79,7 @@ def read_files(data, root, source, only):
     files = {}
     for entry in data["files"]:
         path = pathlib.Path(entry["filename"])
-        if not any(path.is_relative_to(root / s) for s in source) or (only and path.name != only):
+        if not any(path.is_relative_to(root / s) for s in source) or (only and path.name not in only):
             continue
         file = files[entry["filename"]] = File(path, root)
         for branch in entry["branches"]:
@@ -145,8 +146,10 @@ def print_figures(files):
 def main():
     parser = argparse.ArgumentParser()
     parser.add_argument("--source", action="append", required=True)
-    parser.add_argument("--exceptions", type=pathlib.Path, required=True)
-    parser.add_argument("--only", help="name of the one file that counts")
+    judged = parser.add_mutually_exclusive_group(required=True)
+    judged.add_argument("--exceptions", type=pathlib.Path)
+    judged.add_argument("--figures", action="store_true")
+    parser.add_argument("--only", action="append", help="name of a file that counts, alone with others named so")
     parser.add_argument("json", type=pathlib.Path)
     parser.add_argument("lcov", type=pathlib.Path)
     options = parser.parse_args()
@@ -158,6 +161,8 @@ def main():
     if not files:
         sys.exit("no source file has figures")
     print_figures(files.values())
+    if options.figures:
+        return 0
 
     exceptions = read_exceptions(options.exceptions)
     failed = False
