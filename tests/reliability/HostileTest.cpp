@@ -26,9 +26,9 @@ using host::SimRandom;
 #endif
 #endif
 #if defined(FPNAVI_SLOW_BUILD)
-constexpr int64_t kBlocks = 400;
+constexpr int64_t kBlocks = 1000;
 #else
-constexpr int64_t kBlocks = 2000;
+constexpr int64_t kBlocks = 20000;
 #endif
 
 int64_t FromEnvironment(const char* name, int64_t otherwise) {
