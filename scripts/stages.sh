@@ -1,5 +1,5 @@
 # shellcheck shell=bash
-# Sourced by demo and test: the project's directory, and stages that say their name and are silent
+# Sourced by the other scripts: the project's directory, and stages that say their name and are silent
 # otherwise. Their output goes to build/logs; it is shown when a stage fails.
 
 root=$(cd -- "$(dirname -- "${BASH_SOURCE[0]}")/.." && pwd -P)
@@ -50,4 +50,10 @@ configure() {
         fresh=(--fresh)
     fi
     stage "$2: configure" cmake --preset "$1" "${fresh[@]}"
+}
+
+# skipped_tests LOG: from what a GoogleTest program printed, the tests that skipped themselves because
+# they want a process in which nothing has run yet.
+skipped_tests() {
+    sed -nE 's/^\[  SKIPPED \] ([^ ]+) \(.*/\1/p' "$1"
 }
