@@ -34,6 +34,19 @@ TEST_F(ImgJointEdge, OnePixelGivesItsDirectionWhereOneIsEnough) {
     EXPECT_EQ(Key(0, -1), VKEY_DOWN);
 }
 
+TEST_F(ImgJointEdge, MoveOfAsManyPixelsAsTheSensorHasIsAHundredPercent) {
+    Params params;
+    params.Set("s_multiBloclkFlag", 0).Set("s_dimensionlessFlag", 1);
+    params.Set("s_sensorWidth", 5).Set("s_sensorHeight", 4).Apply();
+    TestFrame prev(56, NoisePatch(100, 100, 36, 56), 1);
+    TestFrame curr(56, NoisePatch(104, 95, 36, 56), 1);
+    ASSERT_EQ(ImgCopy(&s_imagePrev, prev.Get()), 0);
+    ASSERT_EQ(ImgCopy(&s_imageCurr, curr.Get()), 0);
+    ASSERT_EQ(CalcImgJoint(), 0);
+    EXPECT_EQ(PrintNaviLog()->dx_fp[0], 100);
+    EXPECT_EQ(PrintNaviLog()->dy_fp[0], 100);
+}
+
 TEST_F(ImgJointEdge, PlacementsOfTheGreatestDifferenceThatIsKeptAreCandidates) {
     // Black against 254 everywhere. The only candidate is the first placement, (8, 8), of template
     // 0, which is cut at (8, 23): 0 rows, -15 columns. 41 x 36 pixels overlap there.

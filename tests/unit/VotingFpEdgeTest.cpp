@@ -37,4 +37,37 @@ TEST_F(FpVoteEdge, LengthJustBelowTheLeastMoveScoresNothing) {
     EXPECT_EQ(Voting_fp_mode(), VKEY_RIGHT);
 }
 
+TEST_F(FpVoteEdge, MatchWhoseLengthWrapsToZeroFailsTheVote) {
+    // 10000 * 16384^2 = 625 * 2^32: nothing is left of it in 32 bits.
+    Params().Set("s_minDelta", 0).Apply();
+    RecordCentroid(1, 0);
+    NaviVoteInfo_t* const record = PrintNaviLog();
+    record->diff[0] = 0;
+    record->dx_fp[0] = 16384;
+    EXPECT_EQ(Voting_fp_mode(), -1);
+    record->dx_fp[0] = 16385;
+    EXPECT_EQ(Voting_fp_mode(), VKEY_RIGHT);
+}
+
+TEST_F(FpVoteEdge, MovesOfOnePixelScoreForTheirDirection) {
+    Params().Set("s_minDelta", 1).Apply();
+    struct Move {
+        int32_t dx;
+        int32_t dy;
+        int32_t key;
+    };
+    // Ten pairs make a way of 10, more than the 8 that a key takes.
+    for (const Move& move :
+         {Move{0, 1, VKEY_UP}, {0, -1, VKEY_DOWN}, {1, 0, VKEY_RIGHT}, {-1, 0, VKEY_LEFT}}) {
+        FpNaviClear();
+        NaviVoteInfo_t* const record = PrintNaviLog();
+        record->calc_cnt = 10;
+        for (int32_t i = 0; i < 10; ++i) {
+            record->dx_fp[i] = move.dx;
+            record->dy_fp[i] = move.dy;
+        }
+        EXPECT_EQ(Voting_fp_mode(), move.key);
+    }
+}
+
 }  // namespace
