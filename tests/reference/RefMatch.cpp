@@ -99,6 +99,9 @@ bool LiesInFrame(const MatchTemplate& tplt) {
 
 // At least half of the template lies in the finger area.
 bool IsValidTemplate(const MatchTemplate& tplt, const uint8_t* pt1, int32_t tpltSize) {
+    if (tplt.tpltWidth < 1) {
+        return false;  // no pixels, however many rows
+    }
     int32_t cnt = 0;
     for (int32_t m = 0; m < tplt.tpltHeight; ++m) {
         for (int32_t n = 0; n < tplt.tpltWidth; ++n) {

@@ -289,6 +289,9 @@ TEST_F(Candidates, TemplatesWithoutPixelsAreNotValid) {
     EXPECT_EQ(Find(frame, frame), Displacements(100, {-8, -29}));
     Params().Set("s_templateWidth", 3).Set("s_templateHeight", -1431655765).Apply();
     EXPECT_EQ(Find(frame, frame), Displacements(100, {-8, -26}));
+    // -2 * 2147483647 = -2^32 + 2, which wraps to 2: its rows, all empty, are not gone through.
+    Params().Set("s_templateWidth", -2).Set("s_templateHeight", 2147483647).Apply();
+    EXPECT_EQ(Find(frame, frame), Displacements(100, {-8, -29}));
 }
 
 TEST_F(Candidates, NowhereToWriteFails) {

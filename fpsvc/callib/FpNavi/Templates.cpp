@@ -35,9 +35,14 @@ void PlaceTemplates(Template (&tplts)[kTpltMax]) {
     tplts[7] = {wLR, hLR, midLR, WrapSub(s_boundWidth, wLR), gh, 0};
 }
 
+// No pixels; one of the sides may be huge all the same.
+bool IsEmpty(const Template& tplt) {
+    return tplt.width < 1 || tplt.height < 1;
+}
+
 // The rectangle at (i0, j0) has no pixel, or all of them lie in the frame.
 bool InsideFrame(int64_t i0, int64_t j0, const Template& tplt) {
-    if (tplt.width < 1 || tplt.height < 1)
+    if (IsEmpty(tplt))
         return true;
     return i0 >= 0 && j0 >= 0 && tplt.height <= s_imageHeight && tplt.width <= s_imageWidth &&
            i0 <= s_imageHeight - tplt.height && j0 <= s_imageWidth - tplt.width;
@@ -45,6 +50,8 @@ bool InsideFrame(int64_t i0, int64_t j0, const Template& tplt) {
 
 // At least half of the template lies in the finger area. type: class map of the template frame.
 bool IsValid(const Template& tplt, const uint8_t* type, int32_t tpltSize) {
+    if (IsEmpty(tplt))
+        return false;
     int32_t cnt = 0;
     for (int32_t m = 0; m < tplt.height; ++m) {
         for (int32_t n = 0; n < tplt.width; ++n)
