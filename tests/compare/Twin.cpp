@@ -1,6 +1,5 @@
 #include "Twin.h"
 
-#include <cstdio>
 #include <cstring>
 
 #include "CenterMove.h"
@@ -8,6 +7,7 @@
 #include "FailingMalloc.h"
 #include "FingerDetect.h"
 #include "Gesture.h"
+#include "LogLines.h"
 #include "NaviFrame.h"
 #include "NaviLimits.h"
 #include "NaviParam.h"
@@ -15,30 +15,11 @@
 #include "Tune.h"
 #include "TuneHistogram.h"
 #include "TuneStep.h"
-#include "alog_host.h"
 
 namespace fpnavi_test {
 namespace {
 
 constexpr size_t kImageBytes = size_t{1} << 20;
-
-// The module's line as the model writes it: process and thread as 0.
-std::string Normalised(std::string line) {
-    const size_t from = line.find("pid=");
-    const size_t to = line.find(" => ", from);
-    if (from != std::string::npos && to != std::string::npos)
-        line.replace(from, to - from, "pid=0:ctid=0");
-    return line;
-}
-
-__attribute__((format(printf, 4, 0))) int TakeLine(void* context, int priority, const char* tag,
-                                                   const char* format, std::va_list args) {
-    char text[2048];
-    const int length = std::vsnprintf(text, sizeof text, format, args);
-    static_cast<std::vector<std::string>*>(context)->push_back(std::to_string(priority) + " " +
-                                                               tag + " " + Normalised(text));
-    return length;
-}
 
 std::string Number(int64_t value) {
     return std::to_string(value);
@@ -55,7 +36,7 @@ Twin::Twin() : m_image(kImageBytes), m_imageReference(kImageBytes) {
     reference::ResetAll();
     reference::FingerBLKTest = ::FingerBLKTest;
     reference::s_logSink = &m_logReference;
-    alog::SetSink(TakeLine, &m_log);
+    LogTo(&m_log);
 }
 
 void Twin::SetParam(const host::ParamBlock* params) {
