@@ -6,18 +6,18 @@
 #include <cstdint>
 #include <cstdlib>
 
-#include "CenterMove.h"
-#include "FindCandidate.h"
 #include "FingerDetect.h"
-#include "FingerNoMove.h"
 #include "FpNavi.h"
-#include "FullImage.h"
-#include "ImgJoint.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
-#include "NaviVoteInfo.h"
-#include "PreProcess.h"
 #include "Reference.h"
+#include "frame/FullImage.h"
+#include "frame/NaviFrame.h"
+#include "frame/PreProcess.h"
+#include "gesture/NaviVoteInfo.h"
+#include "matching/FindCandidate.h"
+#include "matching/ImgJoint.h"
+#include "motion/CenterMove.h"
+#include "motion/FingerNoMove.h"
+#include "param/NaviParam.h"
 
 namespace bench {
 

@@ -3,7 +3,7 @@
 #include <limits>
 #include <string>
 
-#include "NaviParam.h"
+#include "param/NaviParam.h"
 
 namespace fpnavi_fuzz {
 namespace {

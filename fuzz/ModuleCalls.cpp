@@ -9,9 +9,9 @@
 #include "FpNavi.h"
 #include "FuzzFrames.h"
 #include "FuzzParams.h"
-#include "NaviLimits.h"
-#include "NaviParam.h"
 #include "alog_host.h"
+#include "param/NaviLimits.h"
+#include "param/NaviParam.h"
 
 namespace {
 

@@ -5,8 +5,8 @@
 
 #include "FuzzFrames.h"
 #include "FuzzParams.h"
-#include "NaviParam.h"
 #include "Twin.h"
+#include "param/NaviParam.h"
 
 namespace {
 

@@ -1,11 +1,11 @@
 #include "Explain.h"
 
-#include "CenterMove.h"
-#include "FingerNoMove.h"
-#include "Gesture.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
-#include "NaviVoteInfo.h"
+#include "frame/NaviFrame.h"
+#include "gesture/Gesture.h"
+#include "gesture/NaviVoteInfo.h"
+#include "motion/CenterMove.h"
+#include "motion/FingerNoMove.h"
+#include "param/NaviParam.h"
 
 namespace host {
 namespace {

@@ -6,10 +6,10 @@
 
 #include "Error.h"
 #include "Keys.h"
-#include "NaviParam.h"
-#include "NaviVoteInfo.h"
 #include "ParamTable.h"
 #include "Store.h"
+#include "gesture/NaviVoteInfo.h"
+#include "param/NaviParam.h"
 
 namespace host {
 namespace {

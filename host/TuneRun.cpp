@@ -5,10 +5,10 @@
 
 #include "Error.h"
 #include "FpNavi.h"
-#include "NaviParam.h"
-#include "Tune.h"
-#include "TuneHistogram.h"
-#include "TuneStep.h"
+#include "param/NaviParam.h"
+#include "tuning/Tune.h"
+#include "tuning/TuneHistogram.h"
+#include "tuning/TuneStep.h"
 
 namespace host {
 namespace {

@@ -5,10 +5,10 @@
 #include <algorithm>
 #include <vector>
 
-#include "FindCandidate.h"
-#include "NaviParam.h"
 #include "StepFrames.h"
 #include "StepTestPair.h"
+#include "matching/FindCandidate.h"
+#include "param/NaviParam.h"
 
 namespace fpnavi_test {
 namespace {

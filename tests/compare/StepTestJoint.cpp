@@ -8,11 +8,11 @@
 #include <vector>
 
 #include "FailingMalloc.h"
-#include "FindCandidate.h"
-#include "ImgJoint.h"
-#include "NaviParam.h"
 #include "StepFrames.h"
 #include "StepTestPair.h"
+#include "matching/FindCandidate.h"
+#include "matching/ImgJoint.h"
+#include "param/NaviParam.h"
 
 namespace fpnavi_test {
 namespace {

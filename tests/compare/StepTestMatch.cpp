@@ -6,13 +6,13 @@
 #include <limits>
 #include <vector>
 
-#include "BitRows.h"
-#include "FullImage.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
 #include "StepFrames.h"
 #include "StepTestPair.h"
-#include "TileMatch.h"
+#include "base/BitRows.h"
+#include "frame/FullImage.h"
+#include "frame/NaviFrame.h"
+#include "matching/TileMatch.h"
+#include "param/NaviParam.h"
 
 namespace fpnavi_test {
 namespace {

@@ -3,12 +3,12 @@
 
 #include <algorithm>
 
-#include "BitRows.h"
-#include "CenterMove.h"
-#include "FingerNoMove.h"
-#include "ShiftTest.h"
 #include "StepFrames.h"
 #include "StepTestPair.h"
+#include "base/BitRows.h"
+#include "motion/CenterMove.h"
+#include "motion/FingerNoMove.h"
+#include "motion/ShiftTest.h"
 
 namespace fpnavi_test {
 namespace {

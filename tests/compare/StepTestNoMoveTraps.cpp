@@ -4,10 +4,10 @@
 
 #include <limits>
 
-#include "FingerNoMove.h"
-#include "ShiftTest.h"
 #include "StepFrames.h"
 #include "StepTestPair.h"
+#include "motion/FingerNoMove.h"
+#include "motion/ShiftTest.h"
 
 namespace fpnavi_test {
 namespace {

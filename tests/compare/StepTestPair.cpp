@@ -5,15 +5,15 @@
 #include <cstring>
 #include <iterator>
 
-#include "CenterMove.h"
-#include "FindCandidate.h"
-#include "FingerNoMove.h"
-#include "ImgJoint.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
-#include "PlacementDiffs.h"
-#include "PreProcess.h"
 #include "Twin.h"
+#include "frame/NaviFrame.h"
+#include "frame/PreProcess.h"
+#include "matching/FindCandidate.h"
+#include "matching/ImgJoint.h"
+#include "matching/PlacementDiffs.h"
+#include "motion/CenterMove.h"
+#include "motion/FingerNoMove.h"
+#include "param/NaviParam.h"
 
 namespace fpnavi_test {
 namespace {

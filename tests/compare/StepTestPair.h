@@ -13,7 +13,7 @@
 
 #include "ParamTable.h"
 #include "StepFrames.h"
-#include "Templates.h"
+#include "matching/Templates.h"
 
 namespace fpnavi_test {
 

@@ -1,10 +1,10 @@
 // The steps of pre-processing against the plain model: threshold, finger area, stretch.
 #include <gtest/gtest.h>
 
-#include "BitRows.h"
-#include "PreProcess.h"
 #include "StepFrames.h"
 #include "StepTestPair.h"
+#include "base/BitRows.h"
+#include "frame/PreProcess.h"
 
 namespace fpnavi_test {
 namespace {

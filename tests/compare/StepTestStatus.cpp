@@ -4,12 +4,12 @@
 
 #include <algorithm>
 
-#include "FingerStatusFp.h"
-#include "FingerStatusHg.h"
-#include "Gesture.h"
 #include "StepFrames.h"
 #include "StepTestPair.h"
 #include "Twin.h"
+#include "gesture/Gesture.h"
+#include "presence/FingerStatusFp.h"
+#include "presence/FingerStatusHg.h"
 
 namespace fpnavi_test {
 namespace {

@@ -7,9 +7,9 @@
 #include <limits>
 #include <utility>
 
-#include "BitRows.h"
-#include "PreProcess.h"
 #include "StepFrames.h"
+#include "base/BitRows.h"
+#include "frame/PreProcess.h"
 
 namespace fpnavi_test {
 namespace {

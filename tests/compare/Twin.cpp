@@ -2,19 +2,19 @@
 
 #include <cstring>
 
-#include "CenterMove.h"
-#include "DoubleScan.h"
 #include "FailingMalloc.h"
 #include "FingerDetect.h"
-#include "Gesture.h"
 #include "LogLines.h"
-#include "NaviFrame.h"
-#include "NaviLimits.h"
-#include "NaviParam.h"
 #include "Reference.h"
-#include "Tune.h"
-#include "TuneHistogram.h"
-#include "TuneStep.h"
+#include "frame/NaviFrame.h"
+#include "gesture/Gesture.h"
+#include "motion/CenterMove.h"
+#include "motion/DoubleScan.h"
+#include "param/NaviLimits.h"
+#include "param/NaviParam.h"
+#include "tuning/Tune.h"
+#include "tuning/TuneHistogram.h"
+#include "tuning/TuneStep.h"
 
 namespace fpnavi_test {
 namespace {

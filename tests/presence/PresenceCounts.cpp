@@ -14,11 +14,11 @@
 #include <vector>
 
 #include "FingerDetect.h"
-#include "FingerStatusFp.h"
 #include "FpNavi.h"
-#include "NaviParam.h"
 #include "ParamTable.h"
 #include "PresenceFrames.h"
+#include "param/NaviParam.h"
+#include "presence/FingerStatusFp.h"
 
 namespace {
 

@@ -13,10 +13,10 @@
 #include <functional>
 
 #include "FailingMalloc.h"
-#include "NaviFrame.h"
-#include "NaviVoteInfo.h"
 #include "SmallGesture.h"
 #include "Twin.h"
+#include "frame/NaviFrame.h"
+#include "gesture/NaviVoteInfo.h"
 
 namespace fpnavi_test {
 namespace {

@@ -7,14 +7,14 @@
 
 #include <algorithm>
 
-#include "CenterMove.h"
-#include "FingerNoMove.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
-#include "NaviVoteInfo.h"
 #include "RandomGesture.h"
 #include "Twin.h"
 #include "alog_host.h"
+#include "frame/NaviFrame.h"
+#include "gesture/NaviVoteInfo.h"
+#include "motion/CenterMove.h"
+#include "motion/FingerNoMove.h"
+#include "param/NaviParam.h"
 
 namespace fpnavi_test {
 namespace {

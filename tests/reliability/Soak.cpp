@@ -11,8 +11,8 @@
 #include <cstdlib>
 
 #include "FailingMalloc.h"
-#include "NaviVoteInfo.h"
 #include "SmallGesture.h"
+#include "gesture/NaviVoteInfo.h"
 
 namespace {
 

@@ -6,8 +6,8 @@
 #include <cstdint>
 #include <optional>
 
-#include "NaviMath.h"
 #include "Reference.h"
+#include "base/NaviMath.h"
 
 namespace fpnavi_test {
 

@@ -5,7 +5,7 @@
 #include <cstring>
 #include <iostream>
 
-#include "NaviParam.h"
+#include "param/NaviParam.h"
 
 namespace fpnavi_test {
 namespace {

@@ -6,7 +6,7 @@
 #include <memory>
 #include <vector>
 
-#include "BitRows.h"
+#include "base/BitRows.h"
 
 namespace {
 

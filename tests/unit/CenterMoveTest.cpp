@@ -3,8 +3,8 @@
 
 #include <vector>
 
-#include "CenterMove.h"
 #include "Fixtures.h"
+#include "motion/CenterMove.h"
 
 namespace {
 

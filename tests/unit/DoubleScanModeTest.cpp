@@ -5,12 +5,12 @@
 #include <limits>
 #include <vector>
 
-#include "DoubleScan.h"
 #include "Fixtures.h"
-#include "Gesture.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
-#include "VotingFp.h"
+#include "frame/NaviFrame.h"
+#include "gesture/Gesture.h"
+#include "motion/DoubleScan.h"
+#include "param/NaviParam.h"
+#include "vote/VotingFp.h"
 
 namespace {
 

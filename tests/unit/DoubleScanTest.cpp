@@ -5,8 +5,8 @@
 #include <cstring>
 #include <vector>
 
-#include "DoubleScan.h"
 #include "Fixtures.h"
+#include "motion/DoubleScan.h"
 
 namespace {
 

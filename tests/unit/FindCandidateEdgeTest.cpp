@@ -3,10 +3,10 @@
 
 #include <vector>
 
-#include "FindCandidate.h"
 #include "Fixtures.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
+#include "frame/NaviFrame.h"
+#include "matching/FindCandidate.h"
+#include "param/NaviParam.h"
 
 namespace {
 

@@ -4,8 +4,8 @@
 #include <limits>
 #include <vector>
 
-#include "FingerNoMove.h"
 #include "Fixtures.h"
+#include "motion/FingerNoMove.h"
 
 namespace {
 

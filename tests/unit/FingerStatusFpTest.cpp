@@ -3,8 +3,8 @@
 
 #include <vector>
 
-#include "FingerStatusFp.h"
 #include "Fixtures.h"
+#include "presence/FingerStatusFp.h"
 
 namespace {
 

@@ -3,8 +3,8 @@
 
 #include <vector>
 
-#include "FingerStatusHg.h"
 #include "Fixtures.h"
+#include "presence/FingerStatusHg.h"
 
 namespace {
 

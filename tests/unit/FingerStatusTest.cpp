@@ -6,10 +6,10 @@
 #include <array>
 #include <vector>
 
-#include "FingerStatus.h"
 #include "Fixtures.h"
-#include "Gesture.h"
-#include "NaviParam.h"
+#include "gesture/Gesture.h"
+#include "param/NaviParam.h"
+#include "presence/FingerStatus.h"
 
 namespace {
 

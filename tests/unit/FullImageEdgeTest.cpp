@@ -2,8 +2,8 @@
 #include <gtest/gtest.h>
 
 #include "Fixtures.h"
-#include "FullImage.h"
-#include "NaviFrame.h"
+#include "frame/FullImage.h"
+#include "frame/NaviFrame.h"
 
 namespace {
 

@@ -7,8 +7,8 @@
 
 #include "FailingMalloc.h"
 #include "Fixtures.h"
-#include "FullImage.h"
-#include "NaviFrame.h"
+#include "frame/FullImage.h"
+#include "frame/NaviFrame.h"
 
 namespace {
 

@@ -4,13 +4,13 @@
 #include <cstring>
 #include <vector>
 
-#include "DoubleScan.h"
 #include "FailingMalloc.h"
 #include "Fixtures.h"
-#include "Gesture.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
-#include "NaviVoteInfo.h"
+#include "frame/NaviFrame.h"
+#include "gesture/Gesture.h"
+#include "gesture/NaviVoteInfo.h"
+#include "motion/DoubleScan.h"
+#include "param/NaviParam.h"
 
 namespace {
 

@@ -2,8 +2,8 @@
 #include <gtest/gtest.h>
 
 #include "Fixtures.h"
-#include "ImgJoint.h"
-#include "NaviFrame.h"
+#include "frame/NaviFrame.h"
+#include "matching/ImgJoint.h"
 
 namespace {
 

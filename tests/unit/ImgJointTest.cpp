@@ -6,10 +6,10 @@
 
 #include "FailingMalloc.h"
 #include "Fixtures.h"
-#include "FullImage.h"
-#include "ImgJoint.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
+#include "frame/FullImage.h"
+#include "frame/NaviFrame.h"
+#include "matching/ImgJoint.h"
+#include "param/NaviParam.h"
 
 namespace {
 

@@ -5,7 +5,7 @@
 
 #include "FailingMalloc.h"
 #include "Fixtures.h"
-#include "NaviFrame.h"
+#include "frame/NaviFrame.h"
 
 namespace {
 

@@ -3,7 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "Fixtures.h"
-#include "NaviLimits.h"
+#include "param/NaviLimits.h"
 
 namespace {
 

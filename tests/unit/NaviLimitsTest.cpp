@@ -6,9 +6,9 @@
 #include <vector>
 
 #include "Fixtures.h"
-#include "NaviFrame.h"
-#include "NaviLimits.h"
-#include "NaviParam.h"
+#include "frame/NaviFrame.h"
+#include "param/NaviLimits.h"
+#include "param/NaviParam.h"
 
 namespace {
 

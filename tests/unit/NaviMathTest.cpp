@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <limits>
 
-#include "NaviMath.h"
+#include "base/NaviMath.h"
 
 namespace {
 

@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "Fixtures.h"
-#include "NaviParam.h"
+#include "param/NaviParam.h"
 
 namespace {
 

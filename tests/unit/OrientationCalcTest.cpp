@@ -7,10 +7,10 @@
 
 #include "FailingMalloc.h"
 #include "Fixtures.h"
-#include "Gesture.h"
-#include "NaviFrame.h"
-#include "NaviParam.h"
-#include "OrientationCalc.h"
+#include "driver/OrientationCalc.h"
+#include "frame/NaviFrame.h"
+#include "gesture/Gesture.h"
+#include "param/NaviParam.h"
 
 namespace {
 

@@ -5,8 +5,8 @@
 #include <vector>
 
 #include "Fixtures.h"
-#include "NaviFrame.h"
-#include "PreProcess.h"
+#include "frame/NaviFrame.h"
+#include "frame/PreProcess.h"
 
 namespace {
 

@@ -8,8 +8,8 @@
 #include <vector>
 
 #include "LogCapture.h"
-#include "TuneHistogram.h"
 #include "TuneTestSupport.h"
+#include "tuning/TuneHistogram.h"
 
 namespace {
 

@@ -4,8 +4,8 @@
 
 #include <vector>
 
-#include "TuneStep.h"
 #include "TuneTestSupport.h"
+#include "tuning/TuneStep.h"
 
 namespace {
 

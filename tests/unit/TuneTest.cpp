@@ -5,8 +5,8 @@
 #include <limits>
 #include <vector>
 
-#include "Tune.h"
 #include "TuneTestSupport.h"
+#include "tuning/Tune.h"
 
 namespace {
 

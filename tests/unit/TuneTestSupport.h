@@ -8,11 +8,11 @@
 #include <vector>
 
 #include "Fixtures.h"
-#include "Gesture.h"
-#include "NaviParam.h"
-#include "Tune.h"
-#include "TuneHistogram.h"
-#include "TuneStep.h"
+#include "gesture/Gesture.h"
+#include "param/NaviParam.h"
+#include "tuning/Tune.h"
+#include "tuning/TuneHistogram.h"
+#include "tuning/TuneStep.h"
 
 namespace fpnavi_test {
 

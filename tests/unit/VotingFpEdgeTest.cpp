@@ -2,8 +2,8 @@
 #include <gtest/gtest.h>
 
 #include "Fixtures.h"
-#include "NaviParam.h"
-#include "VotingFp.h"
+#include "param/NaviParam.h"
+#include "vote/VotingFp.h"
 
 namespace {
 

@@ -7,8 +7,8 @@
 
 #include "Fixtures.h"
 #include "LogCapture.h"
-#include "NaviParam.h"
-#include "VotingFp.h"
+#include "param/NaviParam.h"
+#include "vote/VotingFp.h"
 
 namespace {
 

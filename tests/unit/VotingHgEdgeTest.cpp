@@ -2,7 +2,7 @@
 #include <gtest/gtest.h>
 
 #include "Fixtures.h"
-#include "VotingHg.h"
+#include "vote/VotingHg.h"
 
 namespace {
 

@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "Fixtures.h"
-#include "VotingHg.h"
+#include "vote/VotingHg.h"
 
 namespace {
 

@@ -8,7 +8,7 @@
 
 #include "Fixtures.h"
 #include "LogCapture.h"
-#include "NaviParam.h"
+#include "param/NaviParam.h"
 
 namespace {
 

@@ -1,0 +1,89 @@
+#include "vote/VotingHg.h"
+
+#include <algorithm>
+
+#include "base/NaviMath.h"
+#include "gesture/NaviVoteInfo.h"
+#include "param/NaviParam.h"
+
+namespace fpnavi {
+namespace {
+
+// Verdicts of the pairs, counted.
+struct VerdictCounts {
+    int32_t byKey[VKEY_NO_MOVE + 1];
+
+    int32_t Moving() const {
+        return byKey[VKEY_UP] + byKey[VKEY_DOWN] + byKey[VKEY_RIGHT] + byKey[VKEY_LEFT];
+    }
+};
+
+VerdictCounts CountVerdicts() {
+    VerdictCounts counts = {};
+    for (int32_t i = 0; i < s_voteInfo.calc_cnt; ++i) {
+        const int32_t vkey = s_voteInfo.vkey_ct[i];
+        if (vkey >= VKEY_NONE && vkey <= VKEY_NO_MOVE)
+            ++counts.byKey[vkey];
+    }
+    return counts;
+}
+
+// Enough pairs moved at all.
+bool CountsSuffice(const VerdictCounts& counts) {
+    const int32_t move_cnt = counts.Moving();
+    return move_cnt >= s_moveCntEffThr ||
+           (counts.byKey[VKEY_NO_MOVE] < move_cnt && move_cnt > s_moveCntMinThr);
+}
+
+// A stroke along one axis: the keys of its two senses and of the axis across, and the centroid's
+// first and last place on it.
+struct Axis {
+    int32_t positive;
+    int32_t negative;
+    int32_t across1;
+    int32_t across2;
+    int32_t first;
+    int32_t last;
+};
+
+// Pairs speak for vkey: more than for either key across, and none for the opposite.
+bool CountsFavour(const VerdictCounts& counts, const Axis& axis, int32_t vkey, int32_t opposite) {
+    return counts.byKey[vkey] > counts.byKey[axis.across1] &&
+           counts.byKey[vkey] > counts.byKey[axis.across2] && counts.byKey[opposite] == 0;
+}
+
+int32_t VoteAlong(const Axis& axis, const VerdictCounts& counts) {
+    const int32_t total = WrapSub(axis.last, axis.first);
+    if (WrapAbs(total) < s_totalMoveThreshold)
+        return VKEY_NO_MOVE;
+    // A centroid that crossed the middle has moved, whatever single pairs say.
+    if (WrapMul(axis.first, axis.last) < 0)
+        return total > 0 ? axis.positive : axis.negative;
+    if (CountsFavour(counts, axis, axis.positive, axis.negative))
+        return CountsSuffice(counts) ? axis.positive : VKEY_NO_MOVE;
+    if (CountsFavour(counts, axis, axis.negative, axis.positive))
+        return CountsSuffice(counts) ? axis.negative : VKEY_NO_MOVE;
+    return VKEY_NO_MOVE;
+}
+
+}  // namespace
+
+int32_t Voting_hg_mode() {
+    const int32_t calc_cnt = s_voteInfo.calc_cnt;
+    const Axis horizontal = {VKEY_RIGHT, VKEY_LEFT,        VKEY_DOWN,
+                             VKEY_UP,    s_voteInfo.xc[0], s_voteInfo.xc[calc_cnt]};
+    const Axis vertical = {VKEY_UP,    VKEY_DOWN,        VKEY_LEFT,
+                           VKEY_RIGHT, s_voteInfo.yc[0], s_voteInfo.yc[calc_cnt]};
+    s_voteInfo.dx_sum = WrapSub(horizontal.last, horizontal.first);
+    s_voteInfo.dy_sum = WrapSub(vertical.last, vertical.first);
+    const VerdictCounts counts = CountVerdicts();
+    if (counts.Moving() == 0)
+        return VKEY_NO_MOVE;
+    const int32_t ax = WrapAbs(s_voteInfo.dx_sum);
+    const int32_t ay = WrapAbs(s_voteInfo.dy_sum);
+    if (WrapMul(100, std::max(ax, ay)) < WrapMul(120, std::min(ax, ay)))
+        return VKEY_NO_MOVE;
+    return ax > ay ? VoteAlong(horizontal, counts) : VoteAlong(vertical, counts);
+}
+
+}  // namespace fpnavi
