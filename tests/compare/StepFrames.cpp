@@ -6,6 +6,8 @@
 #include <iterator>
 #include <limits>
 
+#include "frame/NaviFrame.h"
+
 namespace fpnavi_test {
 namespace {
 
@@ -129,13 +131,6 @@ SimRandom StepRandom(uint64_t test, int64_t index) {
     return SimRandom(host::Mix64(start));
 }
 
-void PathCount::ExpectBoth() const {
-    EXPECT_GT(fast, 0);
-    EXPECT_GT(general, 0);
-    ::testing::Test::RecordProperty("fast", fast);
-    ::testing::Test::RecordProperty("general", general);
-}
-
 FrameSize RandomSize(SimRandom& random) {
     const auto side = [&random] {
         if (random.Chance(4))
@@ -254,6 +249,10 @@ std::vector<uint8_t> RandomTypes(SimRandom& random, FrameSize size) {
 TwinFrame::TwinFrame(FrameSize size, const std::vector<uint8_t>& greys,
                      const std::vector<uint8_t>& types)
     : m_greys(greys), m_types(types), m_greysPlain(greys), m_typesPlain(types) {
+    // The room behind the pixels, with junk in it.
+    const size_t bytes = static_cast<size_t>(fpnavi::FrameBytes(size.width, size.height));
+    m_greys.resize(bytes, 99);
+    m_types.resize(bytes, 1);
     m_module = {size.width, size.height, m_greys.data(), m_types.data(), -7, 9, -11, -13};
     m_plain = {size.width, size.height, m_greysPlain.data(), m_typesPlain.data(), -7, 9, -11, -13};
 }

@@ -21,16 +21,6 @@ int64_t StepCases(int64_t count);
 // The random numbers of one case; FPNAVI_COMPARE_SEED gives others.
 host::SimRandom StepRandom(uint64_t test, int64_t index);
 
-// Cases by the path that the module takes for them.
-struct PathCount {
-    int32_t fast = 0;
-    int32_t general = 0;
-
-    void Note(bool isFast) { ++(isFast ? fast : general); }
-    // Both paths were taken. Keeps the numbers in the test's report.
-    void ExpectBoth() const;
-};
-
 struct FrameSize {
     int32_t width;
     int32_t height;

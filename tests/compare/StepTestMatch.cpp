@@ -8,10 +8,10 @@
 
 #include "StepFrames.h"
 #include "StepTestPair.h"
-#include "base/BitRows.h"
+#include "frame/FramePair.h"
 #include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
-#include "matching/TileMatch.h"
+#include "matching/DisplacementScore.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi_test {
@@ -83,11 +83,6 @@ FrameSize ComparedSize() {
     return {fpnavi::s_imageWidth, fpnavi::s_imageHeight};
 }
 
-// The frames can be compared tile by tile.
-bool FramesFitWords() {
-    return fpnavi::FitsWords(fpnavi::s_imageCurr.width, fpnavi::s_imageCurr.height);
-}
-
 int32_t RandomDisplacement(SimRandom& random, int32_t side) {
     if (random.Chance(2))
         return random.Chance(50) ? std::numeric_limits<int32_t>::min()
@@ -117,12 +112,19 @@ TEST(StepFindMatch, RandomDisplacementsGiveTheSameBest) {
     }
 }
 
+// What the module scores for a displacement of the current pair.
+int32_t ModuleScore(int32_t di, int32_t dj, int32_t most) {
+    const fpnavi::FramePair pair = fpnavi::LayOutPair(fpnavi::s_imagePrev, fpnavi::s_imageCurr);
+    fpnavi::DisplacementScore score(fpnavi::CurrentSearchParams(), pair);
+    return score.At({di, dj}, most);
+}
+
 // The score of a displacement tile by tile: exact up to most, only "above" beyond it.
 void CompareScore(int32_t di, int32_t dj, int32_t score) {
     for (const int32_t most : {0, score - 1, score, score + 1, 254, 255, 256}) {
         if (most < 0 || most > 256)
             continue;
-        const int32_t module = fpnavi::MatchAt({di, dj}, most);
+        const int32_t module = ModuleScore(di, dj, most);
         if (score <= most) {
             ASSERT_EQ(module, score) << "at most " << most;
         } else {
@@ -131,25 +133,15 @@ void CompareScore(int32_t di, int32_t dj, int32_t score) {
     }
 }
 
-void SetTileFrames() {
-    const bool fromPrev = fpnavi::s_imageCurr.cvr > fpnavi::s_imagePrev.cvr;
-    fpnavi::SetMatchFrames(fromPrev ? fpnavi::s_imagePrev : fpnavi::s_imageCurr,
-                           fromPrev ? fpnavi::s_imageCurr : fpnavi::s_imagePrev);
-}
-
 TEST(StepMatchAt, RandomDisplacementsOfTilesGiveTheSameScore) {
     const int64_t cases = StepCases(12000);
-    PathCount paths;
     int64_t scores = 0;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(421, i);
         const host::ParamBlock params = RandomSearchParams(random, RandomSize(random));
         const bool loaded = LoadMatchFrames(random, params);
-        const bool comparable = loaded && FramesFitWords();
-        paths.Note(comparable);
-        if (!comparable)
+        if (!loaded)
             continue;
-        SetTileFrames();
         const FrameSize compared = ComparedSize();
         for (int32_t n = 0; n < 8; ++n, ++scores) {
             const int32_t di = random.Chance(60) ? random.Range(-10, 10)
@@ -161,7 +153,6 @@ TEST(StepMatchAt, RandomDisplacementsOfTilesGiveTheSameScore) {
                 << "case " << i << ", displacement " << di << ", " << dj;
         }
     }
-    paths.ExpectBoth();
     RecordProperty("scores", static_cast<int>(scores));
 }
 
@@ -176,13 +167,11 @@ TEST(StepMatchAt, EveryDisplacementOfSmallFramesGivesTheSameScore) {
         SetTiles(params, size, bound, random.Range(0, 6));
         if (!LoadMatchFrames(random, params))
             continue;
-        ASSERT_TRUE(FramesFitWords());
-        SetTileFrames();
         const FrameSize compared = ComparedSize();
         for (int32_t di = -compared.height - 1; di <= compared.height + 1; ++di) {
             for (int32_t dj = -compared.width - 1; dj <= compared.width + 1; ++dj) {
                 const int32_t score = PlainScore(di, dj);
-                ASSERT_EQ(fpnavi::MatchAt({di, dj}, 256), score)
+                ASSERT_EQ(ModuleScore(di, dj, 256), score)
                     << "case " << i << ", displacement " << di << ", " << dj;
             }
         }
@@ -199,10 +188,9 @@ TEST(StepMatchAt, SidesOf63And64AtTheirFarthestDisplacements) {
             ParamValue(params, "s_multiBloclkFlag") = multi;
             ParamValue(params, "s_overlapAreaMinFp") = 0;
             ASSERT_TRUE(LoadMatchFrames(random, params));
-            SetTileFrames();
             for (const int32_t di : {-72, -71, -65, -64, -63, -62, 0, 62, 63, 64, 65, 70, 71, 72}) {
                 for (const int32_t dj : {-72, -65, -64, -63, -1, 0, 1, 63, 64, 65, 71, 72})
-                    ASSERT_EQ(fpnavi::MatchAt({di, dj}, 256), PlainScore(di, dj))
+                    ASSERT_EQ(ModuleScore(di, dj, 256), PlainScore(di, dj))
                         << di << ", " << dj << ", multi " << multi;
             }
         }
@@ -220,13 +208,12 @@ TEST(StepMatchAtTrap, EarlyStopIsExactAtTheLimit) {
         for (const bool oneLess : {false, true}) {
             greys.back() = static_cast<uint8_t>(oneLess ? grey - 1 : grey);
             LoadPair({FlatBytes(size, 0), FlatBytes(size, 1), greys, FlatBytes(size, 1)});
-            SetTileFrames();
             const int32_t score = oneLess ? grey - 1 : grey;
-            ASSERT_EQ(fpnavi::MatchAt({0, 0}, score), score);
+            ASSERT_EQ(ModuleScore(0, 0, score), score);
             if (score > 0) {
-                ASSERT_GT(fpnavi::MatchAt({0, 0}, score - 1), score - 1);
+                ASSERT_GT(ModuleScore(0, 0, score - 1), score - 1);
             }
-            ASSERT_EQ(fpnavi::MatchAt({0, 0}, 256), score);
+            ASSERT_EQ(ModuleScore(0, 0, 256), score);
         }
     }
 }
@@ -252,9 +239,8 @@ TEST(StepMatchAtTrap, AreaOfExactlyTheMinimumIsTooLittle) {
                 reference::GetFullImg(&reference::s_imagePrev, &reference::s_fullImagePrev);
                 reference::GetFullImg(&reference::s_imageCurr, &reference::s_fullImageCurr);
             }
-            SetTileFrames();
             const int32_t expected = beyond < 0 ? 0 : 255;
-            EXPECT_EQ(fpnavi::MatchAt({0, 0}, 256), expected) << "multi " << multi;
+            EXPECT_EQ(ModuleScore(0, 0, 256), expected) << "multi " << multi;
             EXPECT_EQ(ModuleMatch({0}, {0}).difference, expected) << "multi " << multi;
             EXPECT_EQ(PlainScore(0, 0), expected) << "multi " << multi;
         }

@@ -8,7 +8,6 @@
 #include "base/BitRows.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
-#include "motion/ShiftTest.h"
 
 namespace fpnavi_test {
 namespace {
@@ -17,17 +16,14 @@ using host::SimRandom;
 
 TEST(StepGetCenterAndCoverage, RandomClassMapsGiveTheSame) {
     const int64_t cases = StepCases(70000);
-    PathCount paths;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(201, i);
         const FrameSize size = RandomSize(random);
-        paths.Note(fpnavi::FitsWords(size.width, size.height));
         TwinFrame twin{size, FlatBytes(size, 0), RandomTypes(random, size)};
         ASSERT_EQ(fpnavi::GetCenterAndCoverage(twin.Module()),
                   reference::GetCenterAndCoverage(twin.Plain()));
         ASSERT_TRUE(twin.Same()) << "case " << i << ", " << size.width << " x " << size.height;
     }
-    paths.ExpectBoth();
 }
 
 TEST(StepGetCenterAndCoverage, EverySizeReadsNothingBehindTheLastPixel) {
@@ -76,7 +72,6 @@ void SetNoMoveParams(SimRandom& random, FrameSize size) {
 
 // test: number of the random sequence. Each outcome must come out.
 void CompareNoMove(uint64_t test, int64_t cases, bool preProcessed) {
-    PathCount paths;
     int64_t outcomes[3] = {};
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(test, i);
@@ -89,14 +84,12 @@ void CompareNoMove(uint64_t test, int64_t cases, bool preProcessed) {
             pair.currTypes = pair.prevTypes = FlatBytes(size, 1);
         TwinFrame prev(size, pair.prevGreys, pair.prevTypes);
         TwinFrame curr(size, pair.currGreys, pair.currTypes);
-        paths.Note(fpnavi::CanTestShifts(*prev.Module()));
         const int32_t outcome = NoMove(&prev, &curr);
         ASSERT_FALSE(::testing::Test::HasFailure())
             << "case " << i << ", " << size.width << " x " << size.height;
         ASSERT_GE(outcome, 0);
         ++outcomes[outcome];
     }
-    paths.ExpectBoth();
     for (const int64_t count : outcomes)
         EXPECT_GT(count, 0);
 }
@@ -113,7 +106,6 @@ TEST(StepFingerNoMove, WholeFramesGiveTheSameOutcome) {
 // or too late changes the outcome.
 TEST(StepFingerNoMove, TolerancesAtTheVeryDifferenceGiveTheSameOutcome) {
     const int64_t cases = StepCases(30000);
-    PathCount paths;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(213, i);
         const FrameSize size = {random.Chance(15) ? random.Range(60, 70) : random.Range(1, 12),
@@ -135,12 +127,10 @@ TEST(StepFingerNoMove, TolerancesAtTheVeryDifferenceGiveTheSameOutcome) {
                              {"s_overlapAreaMinNoMove", random.Range(-1, 4)}});
         TwinFrame prev(size, prevGreys, FlatBytes(size, 1));
         TwinFrame curr{size, currGreys, RandomTypes(random, size)};
-        paths.Note(fpnavi::CanTestShifts(*prev.Module()));
         NoMove(&prev, &curr);
         ASSERT_FALSE(::testing::Test::HasFailure())
             << "case " << i << ", " << size.width << " x " << size.height;
     }
-    paths.ExpectBoth();
 }
 
 TEST(StepFingerNoMove, EverySizeReadsNothingBehindTheLastPixel) {

@@ -7,7 +7,6 @@
 #include "StepFrames.h"
 #include "StepTestPair.h"
 #include "motion/FingerNoMove.h"
-#include "motion/ShiftTest.h"
 
 namespace fpnavi_test {
 namespace {
@@ -33,7 +32,6 @@ class StepFingerNoMoveTrap : public ::testing::TestWithParam<int32_t> {
         SetStepParams(params);
         TwinFrame prev(Size(), prevGreys, FlatBytes(Size(), type));
         TwinFrame curr(Size(), currGreys, FlatBytes(Size(), 1));
-        EXPECT_EQ(fpnavi::CanTestShifts(*prev.Module()), Size().width <= 64);
         return NoMove(&prev, &curr);
     }
 

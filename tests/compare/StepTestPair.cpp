@@ -8,9 +8,11 @@
 #include "Twin.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
-#include "matching/FindCandidate.h"
-#include "matching/ImgJoint.h"
-#include "matching/PlacementDiffs.h"
+#include "matching/CandidateHeap.h"
+#include "matching/CandidateSearch.h"
+#include "matching/MatchSearch.h"
+#include "matching/PairMatch.h"
+#include "matching/PlacementScores.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
 #include "param/NaviParam.h"
@@ -241,6 +243,18 @@ Candidates PlainCandidates() {
     return FindWith(reference::FindCandidate);
 }
 
+std::vector<uint32_t> ModuleKeys() {
+    const fpnavi::SearchParams params = fpnavi::CurrentSearchParams();
+    const fpnavi::FramePair pair = fpnavi::LayOutPair(fpnavi::s_imagePrev, fpnavi::s_imageCurr);
+    fpnavi::TemplateSet set;
+    EXPECT_TRUE(fpnavi::CutTemplates(params, pair, &set));
+    std::vector<uint8_t> block(fpnavi::PlanMemory(params, set, nullptr).bytes);
+    const fpnavi::SearchMemory memory = fpnavi::PlanMemory(params, set, block.data());
+    fpnavi::RankCandidates(fpnavi::ScorePlacements(params, set, pair, memory), memory.keys,
+                           params.candidateNum);
+    return {memory.keys, memory.keys + params.candidateNum};
+}
+
 std::ostream& operator<<(std::ostream& out, const MatchResult& match) {
     return out << "dx " << match.dx << " dy " << match.dy << " difference " << match.difference;
 }
@@ -267,14 +281,8 @@ int32_t PlainScore(int32_t di, int32_t dj) {
     return score;
 }
 
-bool IsTabulated() {
-    fpnavi::TemplateSet set;
-    return fpnavi::CutTemplates(&set) && fpnavi::CanTabulate(set);
-}
-
 JointOutcome CalcJoint() {
-    const bool fast = IsTabulated();
-    return {fpnavi::CalcImgJoint(), reference::CalcImgJoint(), fast};
+    return {fpnavi::CalcImgJoint(), reference::CalcImgJoint()};
 }
 
 }  // namespace fpnavi_test

@@ -63,6 +63,9 @@ struct Candidates {
 Candidates ModuleCandidates();
 Candidates PlainCandidates();
 
+// The module's candidates of the current pair as keys, in the order of its heap.
+std::vector<uint32_t> ModuleKeys();
+
 struct MatchResult {
     int32_t dx;
     int32_t dy;
@@ -82,12 +85,8 @@ int32_t PlainScore(int32_t di, int32_t dj);
 struct JointOutcome {
     int32_t module;
     int32_t plain;
-    bool fast;  // the module searched and matched in one step
 };
 JointOutcome CalcJoint();
-
-// The module tabulates the placements of the current pair, or scores them one by one.
-bool IsTabulated();
 
 }  // namespace fpnavi_test
 

@@ -49,29 +49,24 @@ TEST(StepCalcBiThr, FramesBeyondTheCountersRangeGiveTheSame) {
 
 TEST(StepGetFingerRidge, RandomFramesGiveTheSameArea) {
     const int64_t cases = StepCases(70000);
-    PathCount paths;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(111, i);
         const FrameSize size = RandomSize(random);
         const int32_t thr = RandomThreshold(random, 0, 255);
-        paths.Note(fpnavi::FitsWords(size.width, size.height) && thr >= 0 && thr <= 255);
         TwinFrame twin{size, RandomGreys(random, size), RandomTypes(random, size)};
         fpnavi::GetFingerRidge(twin.Module(), thr);
         reference::GetFingerRidge(twin.Plain(), thr);
         ASSERT_TRUE(twin.Same()) << "case " << i << ", " << size.width << " x " << size.height
                                  << ", threshold " << thr;
     }
-    paths.ExpectBoth();
 }
 
 // Few dark pixels: what is between them, in rows and columns, decides everything.
 TEST(StepGetFingerRidge, SparsePixelsSpanTheSameArea) {
     const int64_t cases = StepCases(70000);
-    PathCount paths;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(112, i);
         const FrameSize size = RandomSize(random);
-        paths.Note(fpnavi::FitsWords(size.width, size.height));
         std::vector<uint8_t> greys = FlatBytes(size, 200);
         for (int32_t n = random.Below(8); n > 0; --n)
             greys[static_cast<size_t>(random.Below(static_cast<int32_t>(greys.size())))] = 99;
@@ -80,7 +75,6 @@ TEST(StepGetFingerRidge, SparsePixelsSpanTheSameArea) {
         reference::GetFingerRidge(twin.Plain(), 100);
         ASSERT_TRUE(twin.Same()) << "case " << i << ", " << size.width << " x " << size.height;
     }
-    paths.ExpectBoth();
 }
 
 TEST(StepStretchRange, RandomFramesGiveTheSameGreys) {
@@ -122,17 +116,14 @@ TEST(StepStretchRange, EverySpanAndScaleRoundsTheSame) {
 
 TEST(StepImgPreProcess, RandomFramesComeOutTheSame) {
     const int64_t cases = StepCases(16000);
-    PathCount paths;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(131, i);
         const FrameSize size = RandomSize(random);
         SetStepParams(size, {{"s_cutOffPercent", random.Range(0, 12)}});
-        paths.Note(fpnavi::FitsWords(size.width, size.height));
         TwinFrame twin{size, RandomGreys(random, size), RandomTypes(random, size)};
         ASSERT_EQ(fpnavi::ImgPreProcess(twin.Module()), reference::ImgPreProcess(twin.Plain()));
         ASSERT_TRUE(twin.Same()) << "case " << i << ", " << size.width << " x " << size.height;
     }
-    paths.ExpectBoth();
 }
 
 // Every width and height of the word-wide path, and those just beyond it. Buffers end with the last

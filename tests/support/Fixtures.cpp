@@ -6,12 +6,15 @@
 
 #include "FailingMalloc.h"
 #include "FingerDetect.h"
+#include "frame/NaviFrame.h"
 
 namespace fpnavi_test {
 namespace {
 
 std::vector<FingerBlkCall> s_blkCalls;
 std::function<void(int32_t*)> s_blkAnswer;
+
+constexpr uint8_t kJunk = 1;  // behind the pixels: finger, if anybody read it as a class
 
 size_t Area(int32_t width, int32_t height) {
     return static_cast<size_t>(width) * static_cast<size_t>(height);
@@ -31,7 +34,11 @@ void NaviTest::TearDown() {
 }
 
 TestFrame::TestFrame(int32_t width, int32_t height, uint8_t grey, uint8_t type)
-    : m_greys(Area(width, height), grey), m_types(Area(width, height), type), m_frame{} {
+    : m_greys(static_cast<size_t>(fpnavi::FrameBytes(width, height)), kJunk),
+      m_types(m_greys),
+      m_frame{} {
+    std::fill_n(m_greys.begin(), Area(width, height), grey);
+    std::fill_n(m_types.begin(), Area(width, height), type);
     m_frame.width = width;
     m_frame.height = height;
     m_frame.pData = m_greys.data();
@@ -41,6 +48,10 @@ TestFrame::TestFrame(int32_t width, int32_t height, uint8_t grey, uint8_t type)
 TestFrame::TestFrame(int32_t width, const std::vector<uint8_t>& greys, uint8_t type)
     : TestFrame(width, static_cast<int32_t>(greys.size()) / width, 0, type) {
     std::copy(greys.begin(), greys.end(), m_greys.begin());
+}
+
+std::vector<uint8_t> TestFrame::Pixels(const std::vector<uint8_t>& buffer) const {
+    return Bytes(buffer.data(), m_frame.width * m_frame.height);
 }
 
 uint8_t& TestFrame::Grey(int32_t row, int32_t column) {

@@ -23,7 +23,8 @@ class NaviTest : public ::testing::Test {
     void TearDown() override;
 };
 
-// A frame over buffers of the test's own; never give it to a function that frees buffers.
+// A frame over buffers of the test's own, with the room behind the pixels that navigation frames
+// have, filled with junk; never give it to a function that frees buffers.
 class TestFrame {
   public:
     TestFrame(int32_t width, int32_t height, uint8_t grey = 0, uint8_t type = 0);
@@ -40,10 +41,12 @@ class TestFrame {
 
     NaviFrame_t* Get() { return &m_frame; }
     NaviFrame_t* operator->() { return &m_frame; }
-    const std::vector<uint8_t>& Greys() const { return m_greys; }
-    const std::vector<uint8_t>& Types() const { return m_types; }
+    std::vector<uint8_t> Greys() const { return Pixels(m_greys); }
+    std::vector<uint8_t> Types() const { return Pixels(m_types); }
 
   private:
+    std::vector<uint8_t> Pixels(const std::vector<uint8_t>& buffer) const;
+
     std::vector<uint8_t> m_greys;
     std::vector<uint8_t> m_types;
     NaviFrame_t m_frame;

@@ -4,7 +4,6 @@
 
 #include <cstring>
 #include <memory>
-#include <vector>
 
 #include "base/BitRows.h"
 
@@ -19,12 +18,11 @@ TEST(SpreadTable, LowestBitIsTheFirstByte) {
     EXPECT_EQ(std::memcmp(table.get(), &kSpreadTable, sizeof kSpreadTable), 0);
 }
 
-TEST(SpreadBits, WritesTheGivenNumberOfBytes) {
-    std::vector<uint8_t> bytes(12, 9);
-    SpreadBits(0x5B1, 11, bytes.data());  // 101 1011 0001
-    EXPECT_EQ(bytes, (std::vector<uint8_t>{1, 0, 0, 0, 1, 1, 0, 1, 1, 0, 1, 9}));
-    SpreadBits(0, 8, bytes.data());
-    EXPECT_EQ(bytes, (std::vector<uint8_t>{0, 0, 0, 0, 0, 0, 0, 0, 1, 0, 1, 9}));
+TEST(SpreadBits, LowestSixteenBitsBecomeBytes) {
+    uint8_t bytes[kLanes];
+    Store16(bytes, SpreadBits(0xF85B1));  // 1000 0101 1011 0001
+    const uint8_t expected[kLanes] = {1, 0, 0, 0, 1, 1, 0, 1, 1, 0, 1, 0, 0, 0, 0, 1};
+    EXPECT_EQ(std::memcmp(bytes, expected, kLanes), 0);
 }
 
 }  // namespace

@@ -5,7 +5,8 @@
 
 #include "Fixtures.h"
 #include "frame/NaviFrame.h"
-#include "matching/FindCandidate.h"
+#include "matching/CandidateHeap.h"
+#include "matching/CandidateSearch.h"
 #include "param/NaviParam.h"
 
 namespace {

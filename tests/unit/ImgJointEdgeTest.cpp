@@ -3,7 +3,8 @@
 
 #include "Fixtures.h"
 #include "frame/NaviFrame.h"
-#include "matching/ImgJoint.h"
+#include "matching/MatchSearch.h"
+#include "matching/PairMatch.h"
 
 namespace {
 

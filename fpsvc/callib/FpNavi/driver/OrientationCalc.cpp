@@ -2,11 +2,12 @@
 
 #include "base/NaviLog.h"
 #include "base/NaviMath.h"
+#include "frame/FramePair.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
 #include "gesture/Gesture.h"
 #include "gesture/NaviVoteInfo.h"
-#include "matching/ImgJoint.h"
+#include "matching/PairMatch.h"
 #include "motion/CenterMove.h"
 #include "motion/DoubleScan.h"
 #include "motion/FingerNoMove.h"
@@ -33,6 +34,12 @@ int32_t NextFrame(const uint8_t* data) {
     if (LoadFrame(data) != 0)
         return -1;
     return OrntCalcProcess();
+}
+
+// A frame starts with measures of 0, and nothing but GetCenterAndCoverage changes them. To measure
+// one again that has no finger, or whose finger measures 0, changes nothing.
+bool IsMeasured(const NaviFrame_t& img) {
+    return img.cvr != 0 || img.xc != 0 || img.yc != 0;
 }
 
 bool CoversLess(int32_t coverage) {
@@ -71,7 +78,10 @@ void RecordFingerprint(int32_t n, int32_t vkey) {
 
 // The fingerprint methods of the fp modes, cheapest first.
 int32_t CompareFingerprints(int32_t n) {
-    switch (FingerNoMove(&s_imagePrev, &s_imageCurr)) {
+    if (!AreComparable(&s_imagePrev, &s_imageCurr))
+        return -1;
+    const FramePair pair = LayOutPair(s_imagePrev, s_imageCurr);
+    switch (TestNoMove(pair.prev, pair.curr, CurrentNoMoveLimits())) {
         case kNoMoveResting:
             RecordFingerprint(n, VKEY_NO_MOVE);
             RecordRest(n);
@@ -80,7 +90,7 @@ int32_t CompareFingerprints(int32_t n) {
             RecordFingerprint(n, VKEY_NONE);
             return 0;
         case kNoMoveMoved:
-            return CoversLess(s_coverageMinFp) ? 0 : CalcImgJoint();
+            return CoversLess(s_coverageMinFp) ? 0 : MatchPair(pair);
         default:
             return -1;
     }
@@ -94,8 +104,10 @@ int32_t OrntCalcProcess() {
         return 0;
     if (s_modeFlag != 1 && !PairWorkAcceptable())
         return -1;
-    // The previous frame anew: a gesture's first frame has not been measured yet.
-    if (GetCenterAndCoverage(&s_imagePrev) != 0 || GetCenterAndCoverage(&s_imageCurr) != 0)
+    // The previous frame was measured as the current one of the last pair, but for the first pair.
+    if (!IsMeasured(s_imagePrev) && GetCenterAndCoverage(&s_imagePrev) != 0)
+        return -1;
+    if (GetCenterAndCoverage(&s_imageCurr) != 0)
         return -1;
     if (s_doubleScanFlag == 1)
         CalcDoubleScanMove(DoubleScanZonePrev, DoubleScanZoneCurr, &s_voteInfo);

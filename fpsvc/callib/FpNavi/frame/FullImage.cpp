@@ -1,7 +1,6 @@
 #include "frame/FullImage.h"
 
-#include <cstring>
-
+#include "base/NaviSimd.h"
 #include "frame/NaviFrame.h"
 #include "param/NaviLimits.h"
 #include "param/NaviParam.h"
@@ -13,22 +12,52 @@ constexpr uint8_t kTypeGap = 255;  // class of a pixel that no sensor pixel belo
 
 // The three bands, border, centre and border, into which one axis of the frame is cut.
 struct Bands {
-    int32_t source[3];  // first pixel in the frame
     int32_t target[3];  // first pixel in the full image
     int32_t length[3];  // pixels
+    int32_t gap;        // pixels between two bands
 };
 
 Bands CutBands(int32_t bound, int32_t center, int32_t gap) {
-    return Bands{{0, bound, bound + center},
-                 {0, bound + gap, bound + center + 2 * gap},
-                 {bound, center, bound}};
+    return Bands{{0, bound + gap, bound + center + 2 * gap}, {bound, center, bound}, gap};
 }
 
-// Copies one frame row, cut into bands, to a full-image row; the gaps keep what they hold.
-void SpreadRow(const uint8_t* source, const Bands& columns, uint8_t* target) {
-    for (int32_t b = 0; b < 3; ++b)
-        std::memcpy(target + columns.target[b], source + columns.source[b],
-                    static_cast<size_t>(columns.length[b]));
+// Sixteen bytes are written at a time, from left to right and from top to bottom: what is too much
+// is overwritten by what follows, and behind the last pixel there is room.
+[[gnu::always_inline]] inline void CopyBytes(const uint8_t* source, int32_t count,
+                                             uint8_t* target) {
+    for (uint8_t* const end = target + count; target < end; target += kLanes, source += kLanes)
+        Store16(target, Load16(source));
+}
+
+[[gnu::always_inline]] inline void FillBytes(Bytes16 value, int32_t count, uint8_t* target) {
+    for (uint8_t* const end = target + count; target < end; target += kLanes)
+        Store16(target, value);
+}
+
+// Spreads a row of the frame: its three bands, and what is between them.
+[[gnu::always_inline]] inline void SpreadRow(const uint8_t* source, const Bands& columns,
+                                             Bytes16 gap, uint8_t* target) {
+    const int32_t bound = columns.length[0];
+    const int32_t center = columns.length[1];
+    CopyBytes(source, bound, target);
+    FillBytes(gap, columns.gap, target + bound);
+    CopyBytes(source + bound, center, target + columns.target[1]);
+    FillBytes(gap, columns.gap, target + columns.target[1] + center);
+    CopyBytes(source + bound + center, bound, target + columns.target[2]);
+}
+
+// Spreads one plane of the frame into the full image's; gap pixels are value.
+void SpreadPlane(const uint8_t* source, Bands rows, Bands columns, uint8_t value, uint8_t* target) {
+    const Bytes16 gap = Splat16(value);
+    const int32_t width = 2 * columns.length[0] + columns.length[1];
+    const int32_t fullWidth = width + 2 * columns.gap;
+    for (int32_t r = 0; r < 3; ++r) {
+        for (int32_t n = 0; n < rows.length[r]; ++n, source += width, target += fullWidth)
+            SpreadRow(source, columns, gap, target);
+        const int32_t gapBytes = r < 2 ? rows.gap * fullWidth : 0;
+        FillBytes(gap, gapBytes, target);
+        target += gapBytes;
+    }
 }
 
 // Tiles of negative size cannot be cut out, and negative gaps would lay tiles over each other.
@@ -52,18 +81,12 @@ int32_t GetFullImg(const NaviFrame_t* img, NaviFrame_t* full_img) {
     full_img->width = img->width + 2 * s_gapWidth;
     full_img->height = img->height + 2 * s_gapHeight;
     const int32_t size = full_img->width * full_img->height;  // at most 2^24
-    if (!ReplaceBuffers(full_img, size, kTypeGap))
+    if (!ReplaceBuffers(full_img, size + kLanes))
         return -1;
     const Bands columns = CutBands(s_boundWidth, s_centerWidth, s_gapWidth);
     const Bands rows = CutBands(s_boundHeight, s_centerHeight, s_gapHeight);
-    for (int32_t b = 0; b < 3; ++b) {
-        for (int32_t r = 0; r < rows.length[b]; ++r) {
-            const int32_t from = (rows.source[b] + r) * img->width;
-            const int32_t to = (rows.target[b] + r) * full_img->width;
-            SpreadRow(img->pData + from, columns, full_img->pData + to);
-            SpreadRow(img->pType + from, columns, full_img->pType + to);
-        }
-    }
+    SpreadPlane(img->pData, rows, columns, 0, full_img->pData);
+    SpreadPlane(img->pType, rows, columns, kTypeGap, full_img->pType);
     return 0;
 }
 

@@ -1,8 +1,11 @@
 #include "frame/NaviFrame.h"
 
+#include <algorithm>
 #include <cstdlib>
 #include <cstring>
 
+#include "base/BitRows.h"
+#include "base/NaviSimd.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -13,6 +16,11 @@ NaviFrame_t s_fullImageCurr;
 NaviFrame_t s_fullImagePrev;
 
 namespace {
+
+// The bit rows of the finger fill, and as many words of scratch.
+int32_t FillBytes(int32_t width, int32_t height) {
+    return 2 * height * WordsOf(width) * static_cast<int32_t>(sizeof(uint64_t));
+}
 
 void ReleaseBuffers(NaviFrame_t* img) {
     std::free(img->pData);
@@ -28,18 +36,24 @@ bool HasPixels(const NaviFrame_t* img) {
            img->height >= 1;
 }
 
-bool ReplaceBuffers(NaviFrame_t* img, int32_t size, uint8_t type) {
+bool ReplaceBuffers(NaviFrame_t* img, int32_t bytes) {
     ReleaseBuffers(img);
-    const size_t bytes = static_cast<size_t>(size);
-    img->pData = static_cast<uint8_t*>(std::malloc(bytes));
-    img->pType = static_cast<uint8_t*>(std::malloc(bytes));
-    if (img->pData == nullptr || img->pType == nullptr) {
-        ReleaseBuffers(img);
-        return false;
-    }
-    std::memset(img->pData, 0, bytes);
-    std::memset(img->pType, type, bytes);
-    return true;
+    const size_t size = static_cast<size_t>(bytes);
+    img->pData = static_cast<uint8_t*>(std::malloc(size));
+    img->pType = static_cast<uint8_t*>(std::malloc(size));
+    if (img->pData != nullptr && img->pType != nullptr)
+        return true;
+    ReleaseBuffers(img);
+    return false;
+}
+
+int32_t RoomStart(int32_t width, int32_t height) {
+    return (width * height + kLanes - 1) / kLanes * kLanes;
+}
+
+int32_t FrameBytes(int32_t width, int32_t height) {
+    const int32_t mask = width * height + kLanes;
+    return RoomStart(width, height) + std::max(mask, FillBytes(width, height));
 }
 
 int32_t ImgInit(NaviFrame_t* img, int32_t i_start, int32_t i_end, int32_t j_start, int32_t j_end,
@@ -49,13 +63,16 @@ int32_t ImgInit(NaviFrame_t* img, int32_t i_start, int32_t i_end, int32_t j_star
         return -1;
     const int32_t height = i_end - i_start;
     const int32_t width = j_end - j_start;
-    if (!ReplaceBuffers(img, height * width, 0))
+    if (!ReplaceBuffers(img, FrameBytes(width, height)))
         return -1;
     img->height = height;
     img->width = width;
-    for (int32_t y = 0; y < height; ++y)
-        std::memcpy(img->pData + y * width, data + (i_start + y) * s_imageWidth + j_start,
-                    static_cast<size_t>(width));
+    // Rows of the whole width follow each other in data too.
+    const uint8_t* const first = data + i_start * s_imageWidth + j_start;
+    const int32_t run = width == s_imageWidth ? width * height : width;
+    for (int32_t at = 0, from = 0; at < width * height; at += run, from += s_imageWidth)
+        std::memcpy(img->pData + at, first + from, static_cast<size_t>(run));
+    std::memset(img->pType, 0, static_cast<size_t>(width * height));
     img->cvr = 0;
     img->range = 0;
     img->xc = 0;
@@ -75,11 +92,11 @@ int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src) {
         return -1;
     img_dst->height = img_src->height;
     img_dst->width = img_src->width;
-    const int32_t size = img_src->width * img_src->height;
-    if (!ReplaceBuffers(img_dst, size, 0))
+    if (!ReplaceBuffers(img_dst, FrameBytes(img_src->width, img_src->height)))
         return -1;
-    std::memcpy(img_dst->pData, img_src->pData, static_cast<size_t>(size));
-    std::memcpy(img_dst->pType, img_src->pType, static_cast<size_t>(size));
+    const size_t pixels = static_cast<size_t>(img_src->width * img_src->height);
+    std::memcpy(img_dst->pData, img_src->pData, pixels);
+    std::memcpy(img_dst->pType, img_src->pType, pixels);
     img_dst->cvr = img_src->cvr;
     img_dst->xc = img_src->xc;
     img_dst->yc = img_src->yc;

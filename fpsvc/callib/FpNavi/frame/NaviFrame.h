@@ -29,10 +29,25 @@ void ImgClear(NaviFrame_t* img);
 // stays as it is) or an allocation failed (img_dst has the new sizes but no buffers).
 int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src);
 
-// Replaces both buffers of img by fresh ones of size bytes each: greys of 0, classes of type.
-// Returns false, with both pointers null, when an allocation fails; sizes and measures are the
-// caller's to set.
-bool ReplaceBuffers(NaviFrame_t* img, int32_t size, uint8_t type);
+// Replaces both buffers of img by fresh ones of bytes each, whose content is undefined. Returns
+// false, with both pointers null, when an allocation fails; sizes and measures are the caller's to
+// set.
+bool ReplaceBuffers(NaviFrame_t* img, int32_t bytes);
+
+// Both buffers of a navigation frame (not of a full image) have room behind the pixels for what
+// steps derive from them. Each step that uses the room fills it before it reads it: nothing in it
+// is kept from call to call.
+//
+//   pData: greys, width * height bytes; then the bit rows of the finger fill
+//   pType: classes, width * height bytes; then the mask of LayOut
+//
+// The room starts at a multiple of 16 and lets a step of sixteen bytes read past the last pixel.
+
+// Bytes of each buffer of a frame of these sides, 1..4096: below 2^26.
+int32_t FrameBytes(int32_t width, int32_t height);
+
+// Start of the room in a buffer of a frame of these sides.
+int32_t RoomStart(int32_t width, int32_t height);
 
 // img has both buffers and at least one pixel.
 bool HasPixels(const NaviFrame_t* img);

@@ -2,6 +2,7 @@
 #include "frame/PreProcess.h"
 
 #include "base/NaviMath.h"
+#include "frame/NaviFrame.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -17,18 +18,23 @@ void MarkDarkPixels(NaviFrame_t* img) {
 
 }  // namespace
 
+// The greys are counted once: what the threshold needs is their histogram, what the stretch needs
+// is the same without the pixels outside the finger area.
 int32_t ImgPreProcess(NaviFrame_t* img) {
     if (s_modeFlag == 1) {
         MarkDarkPixels(img);
         return 0;
     }
-    int32_t thr = 0;
-    int32_t scale = 0;
-    if (CalcBiThr(img, &thr, &scale) != 0)
+    if (!HasPixels(img))
         return -1;
-    img->range = static_cast<uint8_t>(scale);  // at most 254
-    GetFingerRidge(img, thr);
-    return StretchRange(img, kGreyMax);
+    const int32_t size = img->width * img->height;
+    int32_t hist[kGreyLevels];
+    CountBytes(img->pData, size, hist);
+    const BiThreshold split = SplitGreys(hist, SumBytes(img->pData, size), size);
+    img->range = static_cast<uint8_t>(split.scale);  // at most 254
+    GetFingerRidge(img, split.thr);
+    StretchFinger(img, kGreyMax, s_cutOffPercent, hist);
+    return 0;
 }
 
 }  // namespace fpnavi

@@ -6,24 +6,41 @@
 #include <cstdint>
 
 #include "FpNavi.h"
+#include "base/GreyHistogram.h"
 
 namespace fpnavi {
 
 // Pre-processes img in place. Returns 0, or -1 for a frame without pixels (fp modes).
 int32_t ImgPreProcess(NaviFrame_t* img);
 
-// Binarisation threshold by the largest variance between the classes. thr receives the threshold
-// 1..254 (0 for a flat image), scale the distance of the class means, 0..254.
+// Binarisation threshold by the largest variance between the classes. thr [out] receives the
+// threshold 1..254 (0 for a flat image), scale [out] the distance of the class means, 0..254.
 // Returns 0, or -1 for a null pointer or an empty frame.
 int32_t CalcBiThr(const NaviFrame_t* img, int32_t* thr, int32_t* scale);
 
 // Builds the finger area in pType: the pixels of grey <= thr and all between two of them in a row
-// or a column, twice over. img has pixels.
+// or a column, twice over. img has pixels, and room behind them (FrameBytes).
 void GetFingerRidge(NaviFrame_t* img, int32_t thr);
 
 // Stretches the greys of the finger area so that its s_cutOffPercent percentile becomes 0 and the
 // opposite one scale. Returns 0, or -1 for a frame without pixels.
 int32_t StretchRange(NaviFrame_t* img, uint8_t scale);
+
+// The two classes that a threshold makes.
+struct BiThreshold {
+    int32_t thr;    // as CalcBiThr gives it
+    int32_t scale;  // likewise
+};
+
+// CalcBiThr of size pixels whose greys sum up to sum and are counted in hist.
+BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int64_t sum, int32_t size);
+
+// StretchRange of a frame with pixels. hist [in, out]: all greys of img, counted; those of the
+// finger area afterwards. cutOff: percent.
+void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t cutOff, int32_t (&hist)[kGreyLevels]);
+
+// The sum of count bytes.
+int64_t SumBytes(const uint8_t* values, int32_t count);
 
 }  // namespace fpnavi
 

@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <cstdint>
 
+#include "base/BitRows.h"
 #include "base/GreyHistogram.h"
 #include "base/NaviMath.h"
 #include "base/NaviSimd.h"
@@ -12,63 +13,47 @@
 namespace fpnavi {
 namespace {
 
-constexpr int32_t kChunk = 512;  // pixels that are looked at in one go
-
 // Grey levels of the finger area's percentiles.
 struct GreySpan {
     int32_t min;
     int32_t max;
 };
 
-// Copies count greys, those outside the finger area as 0, and returns how many lie inside.
-int32_t CopyFinger(const uint8_t* grey, const uint8_t* type, int32_t count, uint8_t* finger) {
+// 64 pixels from p on, fewer at the end of the frame: a bit for each that is not finger.
+uint64_t BackgroundBits(const NaviFrame_t& img, int32_t p) {
     const Bytes16 one = Splat16(1);
-    Sums sums = NoSums();
-    int32_t i = 0;
-    for (; i + kLanes <= count; i += kLanes) {
-        const Bytes16 mask = Equal16(Load16(type + i), one);
-        Store16(finger + i, And16(Load16(grey + i), mask));
-        sums = AddBytes(sums, And16(mask, one));
-    }
-    int32_t inside = Total(sums);
-    for (; i < count; ++i) {
-        const bool isFinger = type[i] == 1;
-        finger[i] = isFinger ? grey[i] : uint8_t{0};
-        inside += isFinger ? 1 : 0;
-    }
-    return inside;
+    const int32_t count = std::min(img.width * img.height - p, kWordPixels);
+    uint64_t finger = 0;
+    for (int32_t i = 0; i < count; i += kLanes)
+        finger |= static_cast<uint64_t>(TopBits16(Equal16(Load16(img.pType + p + i), one))) << i;
+    return ~finger & FirstBits(count);
 }
 
-// Counts the pixels of the finger area by grey level. Pixels outside are counted as grey 0 at
-// first, without a branch. Two tables take turns, since neighbours are often equal and the second
-// would wait for the first. Returns the number of pixels in the area.
-int32_t CountFingerGreys(const NaviFrame_t& img, int32_t (&hist)[kGreyLevels]) {
-    int32_t odd[kGreyLevels] = {};
-    std::fill_n(hist, kGreyLevels, 0);
-    const int32_t size = img.width * img.height;
-    int32_t inside = 0;
-    for (int32_t start = 0; start < size; start += kChunk) {
-        const int32_t count = std::min(kChunk, size - start);
-        uint8_t finger[kChunk + 1];
-        inside += CopyFinger(img.pData + start, img.pType + start, count, finger);
-        finger[count] = 0;  // makes an even number of an odd one
-        for (int32_t i = 0; i < count; i += 2) {
-            ++hist[finger[i]];
-            ++odd[finger[i + 1]];
+// Takes the pixels outside the finger area out of hist, run by run. Returns how many these are.
+int32_t TakeOutBackground(const NaviFrame_t& img, int32_t (&hist)[kGreyLevels]) {
+    ByteCounter counter;
+    int32_t outside = 0;
+    for (int32_t p = 0; p < img.width * img.height; p += kWordPixels) {
+        uint64_t bits = BackgroundBits(img, p);
+        while (bits != 0) {
+            const int32_t start = __builtin_ctzll(bits);
+            const uint64_t after = ~(bits >> start);
+            const int32_t run = after != 0 ? __builtin_ctzll(after) : kWordPixels;
+            counter.Add(img.pData + p + start, run);
+            outside += run;
+            bits &= ~BitsBetween(start, start + run);
         }
-        odd[0] -= count % 2;
     }
-    for (int32_t i = 0; i < kGreyLevels; ++i)
-        hist[i] += odd[i];
-    hist[0] -= size - inside;
-    return inside;
+    for (int32_t level = 0; level < kGreyLevels; ++level)
+        hist[level] -= counter.Of(level);
+    return outside;
 }
 
 // hist: counts by grey level, cnt their sum. The cumulative count only grows: it crosses each limit
 // once at most, and not at all when it lies beyond from the start.
-GreySpan CutPercentiles(const int32_t (&hist)[kGreyLevels], int32_t cnt) {
-    const int32_t lo = WrapMul(cnt, s_cutOffPercent);
-    const int32_t hi = WrapMul(cnt, WrapSub(100, s_cutOffPercent));
+GreySpan CutPercentiles(const int32_t (&hist)[kGreyLevels], int32_t cnt, int32_t cutOff) {
+    const int32_t lo = WrapMul(cnt, cutOff);
+    const int32_t hi = WrapMul(cnt, WrapSub(100, cutOff));
     const int32_t start = 100 * hist[0];
     GreySpan span = {0, 0};
     if (start <= lo) {
@@ -76,53 +61,62 @@ GreySpan CutPercentiles(const int32_t (&hist)[kGreyLevels], int32_t cnt) {
         span.min = level < kGreyLevels ? level - 1 : 0;
     }
     if (start < hi) {
-        const int32_t level = FirstLevelAbove(hist, start, hi - 1);
+        const int32_t level = FirstLevelAboveDownwards(hist, 100 * cnt, hi - 1);
         span.max = level < kGreyLevels ? level : 0;
     }
     return span;
 }
 
-// table[grey] = (grey - min) * scale / (max - min), clamped; below min the quotient is not
-// positive. The division is a multiplication with scale / (max - min) in 1/2^16, rounded up: the
-// product is too large by less than 255 / 2^16, and a quotient lies at least 1 / (max - min) >= 1 /
-// 255 below the next integer.
-void MakeStretchTable(const GreySpan& span, uint32_t scale, uint8_t (&table)[kGreyLevels]) {
+// The stretched grey is (grey - min) * scale / range, truncated and clamped; below min it is 0. The
+// division is a multiplication with scale / range in 1/2^16, rounded up: the product is too large
+// by less than 255 / 2^16, and a quotient lies at least 1 / range >= 1 / 255 below the next
+// integer.
+void StretchPixels(const GreySpan& span, uint32_t scale, NaviFrame_t* img) {
     const uint32_t range = static_cast<uint32_t>(span.max - span.min);
     const uint32_t factor = ((scale << 16) + range - 1) / range;  // at most 255 * 2^16
-    for (int32_t grey = 0; grey < kGreyLevels; ++grey) {
-        const uint32_t above = static_cast<uint32_t>(std::max(grey - span.min, 0));
-        table[grey] = ClampToGrey(static_cast<int32_t>(above * factor >> 16));
-    }
-}
-
-// Replaces the greys of the finger area by their entries in table.
-void StretchPixels(NaviFrame_t* img, const uint8_t (&table)[kGreyLevels]) {
+    const Bytes16 min = Splat16(static_cast<uint8_t>(span.min));
+    const Bytes16 one = Splat16(1);
     const int32_t size = img->width * img->height;
-    for (int32_t start = 0; start < size; start += kChunk) {
-        const int32_t count = std::min(kChunk, size - start);
-        uint8_t* const grey = img->pData + start;
-        const uint8_t* const type = img->pType + start;
-        uint8_t stretched[kChunk];
-        for (int32_t i = 0; i < count; ++i)
-            stretched[i] = table[grey[i]];
-        for (int32_t i = 0; i < count; ++i)
-            grey[i] = type[i] == 1 ? stretched[i] : grey[i];
+    // The last step reaches into the room behind the pixels, which nobody reads.
+    for (int32_t p = 0; p < size; p += kLanes) {
+        const Bytes16 grey = Load16(img->pData + p);
+        const Bytes16 finger = Equal16(Load16(img->pType + p), one);
+        const Bytes16 stretched = Scale16(Excess16(grey, min), factor);
+        Store16(img->pData + p, Or16(And16(stretched, finger), AndNot16(grey, finger)));
     }
 }
 
 }  // namespace
 
+int64_t SumBytes(const uint8_t* values, int32_t count) {
+    constexpr int32_t kRun = 1 << 20;  // 255 * 2^20 < 2^31
+    int64_t sum = 0;
+    int32_t i = 0;
+    while (count - i >= kLanes) {
+        const int32_t end = i + std::min(count - i, kRun) / kLanes * kLanes;
+        Sums sums = NoSums();
+        for (; i < end; i += kLanes)
+            sums = AddBytes(sums, Load16(values + i));
+        sum += Total(sums);
+    }
+    for (; i < count; ++i)
+        sum += values[i];
+    return sum;
+}
+
+void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t cutOff, int32_t (&hist)[kGreyLevels]) {
+    const int32_t cnt = img->width * img->height - TakeOutBackground(*img, hist);
+    const GreySpan span = CutPercentiles(hist, cnt, cutOff);
+    if (span.max - span.min >= 1)
+        StretchPixels(span, scale, img);
+}
+
 int32_t StretchRange(NaviFrame_t* img, uint8_t scale) {
     if (!HasPixels(img))
         return -1;
     int32_t hist[kGreyLevels];
-    const int32_t cnt = CountFingerGreys(*img, hist);
-    const GreySpan span = CutPercentiles(hist, cnt);
-    if (span.max - span.min < 1)
-        return 0;
-    uint8_t table[kGreyLevels];
-    MakeStretchTable(span, scale, table);
-    StretchPixels(img, table);
+    CountBytes(img->pData, img->width * img->height, hist);
+    StretchFinger(img, scale, s_cutOffPercent, hist);
     return 0;
 }
 

@@ -3,7 +3,6 @@
 #include <algorithm>
 
 #include "base/NaviMath.h"
-#include "frame/NaviFrame.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -14,25 +13,25 @@ constexpr int32_t kTpltCoverageMin = 49;  // percent of a template that must be 
 
 // Templates 0 to 3 lie at the top, bottom, right and left inside the centre region, 4 to 7 just
 // outside it, in the border tiles, and carry the gap between.
-void PlaceTemplates(Template (&tplts)[kTpltMax]) {
-    const int32_t wUD = s_tpltWidthUD;
-    const int32_t hUD = s_tpltHeightUD;
-    const int32_t wLR = s_tpltWidthLR;
-    const int32_t hLR = s_tpltHeightLR;
-    const int32_t bottom = WrapSub(s_imageHeight, s_boundHeight);
-    const int32_t right = WrapAdd(s_boundWidth, s_centerWidth);
-    const int32_t midUD = WrapSub(s_imageWidth, wUD) / 2;
-    const int32_t midLR = WrapSub(s_imageHeight, hLR) / 2;
-    const int32_t gh = s_gapHeight;
-    const int32_t gw = s_gapWidth;
-    tplts[0] = {wUD, hUD, s_boundHeight, midUD, gh, gw};
+void PlaceTemplates(const SearchParams& p, Template (&tplts)[kTpltMax]) {
+    const int32_t wUD = p.tpltWidthUD;
+    const int32_t hUD = p.tpltHeightUD;
+    const int32_t wLR = p.tpltWidthLR;
+    const int32_t hLR = p.tpltHeightLR;
+    const int32_t bottom = WrapSub(p.imageHeight, p.boundHeight);
+    const int32_t right = WrapAdd(p.boundWidth, p.centerWidth);
+    const int32_t midUD = WrapSub(p.imageWidth, wUD) / 2;
+    const int32_t midLR = WrapSub(p.imageHeight, hLR) / 2;
+    const int32_t gh = p.gapHeight;
+    const int32_t gw = p.gapWidth;
+    tplts[0] = {wUD, hUD, p.boundHeight, midUD, gh, gw};
     tplts[1] = {wUD, hUD, WrapSub(bottom, hUD), midUD, gh, gw};
-    tplts[2] = {wLR, hLR, midLR, WrapSub(WrapSub(s_imageWidth, s_boundWidth), wLR), gh, gw};
-    tplts[3] = {wLR, hLR, midLR, s_boundWidth, gh, gw};
-    tplts[4] = {wUD, hUD, WrapSub(s_boundHeight, hUD), midUD, 0, gw};
+    tplts[2] = {wLR, hLR, midLR, WrapSub(WrapSub(p.imageWidth, p.boundWidth), wLR), gh, gw};
+    tplts[3] = {wLR, hLR, midLR, p.boundWidth, gh, gw};
+    tplts[4] = {wUD, hUD, WrapSub(p.boundHeight, hUD), midUD, 0, gw};
     tplts[5] = {wUD, hUD, bottom, midUD, WrapMul(2, gh), gw};
     tplts[6] = {wLR, hLR, midLR, right, gh, WrapMul(2, gw)};
-    tplts[7] = {wLR, hLR, midLR, WrapSub(s_boundWidth, wLR), gh, 0};
+    tplts[7] = {wLR, hLR, midLR, WrapSub(p.boundWidth, wLR), gh, 0};
 }
 
 // No pixels; one of the sides may be huge all the same.
@@ -41,67 +40,75 @@ bool IsEmpty(const Template& tplt) {
 }
 
 // The rectangle at (i0, j0) has no pixel, or all of them lie in the frame.
-bool InsideFrame(int64_t i0, int64_t j0, const Template& tplt) {
+bool InsideFrame(const SearchParams& params, int64_t i0, int64_t j0, const Template& tplt) {
     if (IsEmpty(tplt))
         return true;
-    return i0 >= 0 && j0 >= 0 && tplt.height <= s_imageHeight && tplt.width <= s_imageWidth &&
-           i0 <= s_imageHeight - tplt.height && j0 <= s_imageWidth - tplt.width;
+    return i0 >= 0 && j0 >= 0 && tplt.height <= params.imageHeight &&
+           tplt.width <= params.imageWidth && i0 <= params.imageHeight - tplt.height &&
+           j0 <= params.imageWidth - tplt.width;
 }
 
-// At least half of the template lies in the finger area. type: class map of the template frame.
-bool IsValid(const Template& tplt, const uint8_t* type, int32_t tpltSize) {
+// At least half of the template lies in the finger area of frame.
+bool IsValid(const Template& tplt, const LaidFrame& frame, int32_t tpltSize) {
     if (IsEmpty(tplt))
         return false;
-    int32_t cnt = 0;
-    for (int32_t m = 0; m < tplt.height; ++m) {
-        for (int32_t n = 0; n < tplt.width; ++n)
-            cnt += type[(tplt.i0 + m) * s_imageWidth + tplt.j0 + n] == 1 ? 1 : 0;
-    }
-    return 100 * int64_t{cnt} / tpltSize > kTpltCoverageMin;
+    const Meeting rows = {0, tplt.height, 1, {{tplt.i0, tplt.i0 + tplt.height}}};
+    const Meeting columns = {0, tplt.width, 1, {{tplt.j0, tplt.j0 + tplt.width}}};
+    const int64_t cnt = CommonArea(frame, frame, {&rows, &columns});
+    return 100 * cnt / tpltSize > kTpltCoverageMin;
 }
 
-bool PlacementsUsable(const Placements& where, const Template& tplt) {
+bool PlacementsUsable(const SearchParams& params, const Placements& where, const Template& tplt) {
     return where.Empty() || (where.iLast <= kKeyFieldMax && where.jLast <= kKeyFieldMax &&
-                             InsideFrame(where.iFirst, where.jFirst, tplt) &&
-                             InsideFrame(where.iLast, where.jLast, tplt));
+                             InsideFrame(params, where.iFirst, where.jFirst, tplt) &&
+                             InsideFrame(params, where.iLast, where.jLast, tplt));
 }
 
 }  // namespace
 
-// The last column is counted from s_boundHeight: with unequal borders the region is shifted.
-Placements PlacementsOf(const Template& tplt) {
-    return {s_boundHeight, int64_t{s_centerHeight} + s_boundHeight - tplt.height, s_boundWidth,
-            int64_t{s_boundHeight} + s_centerWidth - tplt.width};
+SearchParams CurrentSearchParams() {
+    return {s_imageWidth,   s_imageHeight,     s_boundWidth,
+            s_boundHeight,  s_centerWidth,     s_centerHeight,
+            s_gapWidth,     s_gapHeight,       s_multiBloclkFlag == 1,
+            s_tpltNum,      s_tpltWidthUD,     s_tpltHeightUD,
+            s_tpltWidthLR,  s_tpltHeightLR,    WrapMul(s_templateHeight, s_templateWidth),
+            s_candidateNum, s_overlapAreaMinFp};
 }
 
-bool CutTemplates(TemplateSet* set) {
-    const bool cutFromPrev = s_imageCurr.cvr > s_imagePrev.cvr;
-    set->cut = cutFromPrev ? &s_imagePrev : &s_imageCurr;
-    set->searched = cutFromPrev ? &s_imageCurr : &s_imagePrev;
-    set->tpltSize = WrapMul(s_templateHeight, s_templateWidth);
-    if (set->tpltSize < 1 || !HasPixels(set->cut) || !HasPixels(set->searched))
+// The last column is counted from boundHeight: with unequal borders the region is shifted.
+Placements PlacementsOf(const SearchParams& params, const Template& tplt) {
+    return {params.boundHeight, int64_t{params.centerHeight} + params.boundHeight - tplt.height,
+            params.boundWidth, int64_t{params.boundHeight} + params.centerWidth - tplt.width};
+}
+
+bool CutTemplates(const SearchParams& params, const FramePair& pair, TemplateSet* set) {
+    const LaidFrame& cut = pair.Cut();
+    if (params.tpltSize < 1 || cut.width != params.imageWidth || cut.height != params.imageHeight)
         return false;
-    PlaceTemplates(set->tplts);
+    set->gapHeight = params.gapHeight;
+    set->gapWidth = params.gapWidth;
+    set->tpltSize = params.tpltSize;
+    PlaceTemplates(params, set->tplts);
     for (int32_t k = 0; k < kTpltMax; ++k) {
         const Template& tplt = set->tplts[k];
         set->valid[k] = false;
-        if (k >= s_tpltNum)
+        if (k >= params.tpltNum)
             continue;
-        if (!InsideFrame(tplt.i0, tplt.j0, tplt))
+        if (!InsideFrame(params, tplt.i0, tplt.j0, tplt))
             return false;
-        set->valid[k] = IsValid(tplt, set->cut->pType, set->tpltSize);
-        if (set->valid[k] && !PlacementsUsable(PlacementsOf(tplt), tplt))
+        set->valid[k] = IsValid(tplt, cut, params.tpltSize);
+        if (set->valid[k] && !PlacementsUsable(params, PlacementsOf(params, tplt), tplt))
             return false;
     }
     return true;
 }
 
-Displacement DisplacementOf(const Template (&tplts)[kTpltMax], uint32_t key) {
+Displacement DisplacementOf(const TemplateSet& set, uint32_t key) {
     const int32_t i = static_cast<int32_t>(key >> 16 & 0xFFU);
     const int32_t j = static_cast<int32_t>(key >> 8 & 0xFFU);
-    const Template& tplt = tplts[key & 0xFFU];
-    return {WrapSub(WrapAdd(i, s_gapHeight), WrapAdd(tplt.i0, tplt.di)),
-            WrapSub(WrapAdd(j, s_gapWidth), WrapAdd(tplt.j0, tplt.dj))};
+    const Template& tplt = set.tplts[key & 0xFFU];
+    return {WrapSub(WrapAdd(i, set.gapHeight), WrapAdd(tplt.i0, tplt.di)),
+            WrapSub(WrapAdd(j, set.gapWidth), WrapAdd(tplt.j0, tplt.dj))};
 }
 
 }  // namespace fpnavi

@@ -5,11 +5,34 @@
 
 #include <cstdint>
 
-#include "FpNavi.h"
+#include "frame/FramePair.h"
 
 namespace fpnavi {
 
 inline constexpr int32_t kTpltMax = 8;
+
+// What the candidate search and the match read of the parameters, in pixels.
+struct SearchParams {
+    int32_t imageWidth;
+    int32_t imageHeight;
+    int32_t boundWidth;  // tiles of a frame: border, centre, border
+    int32_t boundHeight;
+    int32_t centerWidth;
+    int32_t centerHeight;
+    int32_t gapWidth;  // unread sensor pixels between two tiles
+    int32_t gapHeight;
+    bool tiled;           // the gaps count
+    int32_t tpltNum;      // templates in use
+    int32_t tpltWidthUD;  // of the wide templates
+    int32_t tpltHeightUD;
+    int32_t tpltWidthLR;  // of the tall ones
+    int32_t tpltHeightLR;
+    int32_t tpltSize;        // divisor of a placement's sum; below 1 there is no search
+    int32_t candidateNum;    // candidates kept
+    int32_t overlapAreaMin;  // a match needs more pixels that are finger in both frames
+};
+
+SearchParams CurrentSearchParams();
 
 // A rectangle cut out of the template frame, and what turns a placement into a displacement.
 struct Template {
@@ -39,23 +62,24 @@ struct Displacement {
     bool operator==(const Displacement& other) const { return di == other.di && dj == other.dj; }
 };
 
-// The templates of one search and the frames that it goes through.
 struct TemplateSet {
     Template tplts[kTpltMax];
-    bool valid[kTpltMax];         // at least half of it is finger
-    const NaviFrame_t* cut;       // the frame with less finger gives the templates
-    const NaviFrame_t* searched;  // the other one has room to find them
-    int32_t tpltSize;             // pixels of each
+    bool valid[kTpltMax];  // at least half of it is finger
+    int32_t gapHeight;
+    int32_t gapWidth;
+    int32_t tpltSize;
 };
 
-// Cuts the templates from s_imageCurr or s_imagePrev. Returns false when the template has no area,
-// a frame no pixels, or a template or a placement of a valid one would leave the frame or its key.
-bool CutTemplates(TemplateSet* set);
+// Cuts the templates from pair.Cut(). Returns false when the template has no area, the frames are
+// not of the image's size, or a template or a placement of a valid one would leave the frame or its
+// key.
+bool CutTemplates(const SearchParams& params, const FramePair& pair, TemplateSet* set);
 
-Placements PlacementsOf(const Template& tplt);
+Placements PlacementsOf(const SearchParams& params, const Template& tplt);
 
 // Key of a placement: difference, row, column, template, from the top byte down. Smaller is better.
 inline constexpr uint32_t kKeySentinel = 0xFF000000U;  // worse than every placement that counts
+inline constexpr int32_t kDiffKept = 254;  // the worst difference that is better than a sentinel
 
 inline uint32_t MakeKey(int32_t diff, int32_t i, int32_t j, int32_t k) {
     return static_cast<uint32_t>(diff) << 24 | static_cast<uint32_t>(i) << 16 |
@@ -63,7 +87,7 @@ inline uint32_t MakeKey(int32_t diff, int32_t i, int32_t j, int32_t k) {
 }
 
 // The displacement of the key's placement.
-Displacement DisplacementOf(const Template (&tplts)[kTpltMax], uint32_t key);
+Displacement DisplacementOf(const TemplateSet& set, uint32_t key);
 
 }  // namespace fpnavi
 

@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "base/BitRows.h"
 #include "base/NaviMath.h"
+#include "base/NaviSimd.h"
 #include "frame/NaviFrame.h"
 #include "param/NaviParam.h"
 
@@ -23,45 +23,50 @@ bool IsDeformation(int32_t dcvr, int32_t way) {
     return WrapAbs(deform_rate) > s_deformThreshold;
 }
 
-// The finger's pixels, counted, and the sums of their centres in hundredths of a pixel.
+// The finger's pixels, and the sums of their columns and rows. A frame of 4096 x 4096 pixels has
+// 2^24 of them, and sums below 2^36.
 struct FingerSums {
-    int64_t cnt;
-    int64_t x;
-    int64_t y;
+    int64_t count;
+    int64_t column;
+    int64_t row;
 };
 
-FingerSums SumBytes(const NaviFrame_t& img) {
+// The sums of sixteen columns from first on, of which the frame has the first count.
+//
+// Row sums need no multiplication: sum(row * pixels(row)) is the sum over all rows but row 0 of the
+// pixels at or below it. Rows are read upwards, and the pixels so far are added up row by row.
+// In 32 bits: at most 16 * 4096 pixels, 2^16 * 15 columns, 2^16 * 2^12 / 2 rows.
+FingerSums SumStrip(const NaviFrame_t& img, int32_t first, int32_t count) {
+    const Bytes16 one = Splat16(1);
+    const Bytes16 ones = And16(FirstBytes(count), one);
+    const Bytes16 columns = And16(FirstBytes(count), LaneNumbers());
+    Sums pixels = NoSums();
+    Sums columnSums = NoSums();
+    Sums rowSums = NoSums();
+    for (int32_t row = img.height - 1; row >= 0; --row) {
+        rowSums = AddSums(rowSums, pixels);
+        const Bytes16 finger = Equal16(Load16(img.pType + row * img.width + first), one);
+        pixels = AddBytes(pixels, And16(finger, ones));
+        columnSums = AddBytes(columnSums, And16(finger, columns));
+    }
+    const int64_t all = Total(pixels);
+    return {all, Total(columnSums) + first * all, Total(rowSums)};
+}
+
+FingerSums SumFinger(const NaviFrame_t& img) {
     FingerSums sums = {0, 0, 0};
-    for (int32_t row = 0; row < img.height; ++row) {
-        for (int32_t column = 0; column < img.width; ++column) {
-            if (img.pType[row * img.width + column] != 1)
-                continue;
-            ++sums.cnt;
-            sums.x += 100 * column + 50;
-            sums.y += 100 * row + 50;
-        }
+    for (int32_t first = 0; first < img.width; first += kLanes) {
+        const FingerSums strip = SumStrip(img, first, std::min(img.width - first, kLanes));
+        sums.count += strip.count;
+        sums.column += strip.column;
+        sums.row += strip.row;
     }
     return sums;
 }
 
-// The same for up to 64 rows of up to 64 pixels: counts of rows come from words, counts of columns
-// from bytes, and all fit 32 bits.
-FingerSums SumWords(const NaviFrame_t& img) {
-    uint8_t inColumn[kWordPixels] = {};
-    int32_t cnt = 0;
-    int32_t y = 0;
-    for (int32_t row = 0; row < img.height; ++row) {
-        const uint8_t* const type = img.pType + row * img.width;
-        const int32_t inRow = CountBits(EqualBits(type, img.width, 1));
-        cnt += inRow;
-        y += inRow * (100 * row + 50);
-        for (int32_t column = 0; column < img.width; ++column)
-            inColumn[column] = static_cast<uint8_t>(inColumn[column] + (type[column] == 1));
-    }
-    int32_t x = 0;
-    for (int32_t column = 0; column < img.width; ++column)
-        x += inColumn[column] * (100 * column + 50);
-    return {cnt, x, y};
+// The place of a pixel is its centre: 100 * place + 50, in hundredths of a pixel.
+int64_t Centre(int64_t placeSum, int64_t count, int32_t side) {
+    return (100 * placeSum + 50 * count) / (side * count);
 }
 
 }  // namespace
@@ -69,11 +74,12 @@ FingerSums SumWords(const NaviFrame_t& img) {
 int32_t GetCenterAndCoverage(NaviFrame_t* img) {
     if (!HasPixels(img))
         return -1;
-    const FingerSums sums = FitsWords(img->width, img->height) ? SumWords(*img) : SumBytes(*img);
+    const FingerSums sums = SumFinger(*img);
     const int64_t size = int64_t{img->width} * img->height;
-    img->xc = sums.cnt == 0 ? 0 : static_cast<int32_t>(sums.x / (img->width * sums.cnt) - 50);
-    img->yc = sums.cnt == 0 ? 0 : static_cast<int32_t>(50 - sums.y / (img->height * sums.cnt));
-    img->cvr = static_cast<int32_t>(100 * sums.cnt / size);
+    const bool any = sums.count != 0;
+    img->xc = any ? static_cast<int32_t>(Centre(sums.column, sums.count, img->width) - 50) : 0;
+    img->yc = any ? static_cast<int32_t>(50 - Centre(sums.row, sums.count, img->height)) : 0;
+    img->cvr = static_cast<int32_t>(100 * sums.count / size);
     return 0;
 }
 

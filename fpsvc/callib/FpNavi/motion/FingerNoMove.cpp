@@ -1,123 +1,192 @@
+// Requirement: the least mean grey difference of all small shifts, told apart three ways: below the
+// tolerance, not below, or no shift with enough common finger area.
+//
+// Observation: the least difference itself is not needed. Rest is known with the first shift below
+// the tolerance; and a sum of differences only grows, so a shift is known not to be below as soon
+// as its sum reaches tolerance * area.
+//
+// Algorithm: the unshifted frames first, since a resting finger mostly rests there. The area is
+// bounded from above at first, and counted only for shifts whose sum stays below.
 #include "motion/FingerNoMove.h"
 
 #include <algorithm>
+#include <limits>
 
 #include "base/NaviMath.h"
-#include "frame/NaviFrame.h"
-#include "motion/ShiftTest.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
 namespace {
 
-constexpr int32_t kBlockNum = 5;
+constexpr int32_t kMeanNone = 256;  // least mean when no shift counts: above every mean
+constexpr int32_t kRegionMax = 4;   // pairings of one shift
 
-// The regions that are compared: four border bands without the corners, and the centre.
-struct Block {
-    int32_t i_start;  // top row
-    int32_t j_start;  // left column
-    int32_t width;
-    int32_t height;
+// One axis of the frame: border, centre, border. Borders of more than half the side overlap, and
+// leave no centre; a band that does not lie inside the side is empty.
+struct Bands {
+    Span first;
+    Span centre;
+    Span last;
+
+    bool Overlap() const { return last.first < first.last; }
 };
 
-struct Overlap {
-    int32_t sum;   // of grey differences; wraps beyond 2^23 pixels of the greatest difference
-    int32_t area;  // pixels that are finger in both frames
+Bands CutBands(int32_t side, int32_t bound) {
+    if (bound < 0 || bound > side)
+        return {{0, 0}, {0, 0}, {0, 0}};
+    return {{0, bound}, {bound, side - bound}, {side - bound, side}};
+}
+
+// Places of the bands that lie in the same band after the shift. A pixel of the previous frame
+// meets that of the current one shift places before it.
+Meeting StayIn(int32_t shift, const Span& a, const Span& b = {0, 0}, const Span& c = {0, 0}) {
+    Meeting meeting = {-shift, 0, 0, {}};
+    for (const Span& band : {a, b, c})
+        meeting.Add(Meet(band, band, -shift));
+    return meeting;
+}
+
+// What is compared at one shift: five regions, the centre and four border bands without the
+// corners. Regions that overlap are pairings of their own: a pixel of both counts twice.
+struct Regions {
+    int32_t count;
+    Meeting rows[kRegionMax];
+    Meeting columns[kRegionMax];
+
+    void Add(const Meeting& ofRows, const Meeting& ofColumns) {
+        if (ofRows.count == 0 || ofColumns.count == 0)
+            return;
+        rows[count] = ofRows;
+        columns[count] = ofColumns;
+        ++count;
+    }
+    Pairing At(int32_t region) const { return {&rows[region], &columns[region]}; }
 };
 
-void CutBlocks(int32_t width, int32_t height, Block (&blocks)[kBlockNum]) {
-    const int32_t bw = s_boundWidth;
-    const int32_t bh = s_boundHeight;
-    const int32_t innerWidth = WrapSub(width, WrapMul(2, bw));
-    const int32_t innerHeight = WrapSub(height, WrapMul(2, bh));
-    blocks[0] = {0, bw, innerWidth, bh};
-    blocks[1] = {WrapSub(height, bh), bw, innerWidth, bh};
-    blocks[2] = {bh, 0, bw, innerHeight};
-    blocks[3] = {bh, WrapSub(width, bw), bw, innerHeight};
-    blocks[4] = {bh, bw, innerWidth, innerHeight};
+Regions ShiftRegions(const Bands& rows, const Bands& columns, int32_t dr, int32_t dc) {
+    Regions regions;
+    regions.count = 0;
+    const Meeting centreRows = StayIn(dr, rows.centre);
+    const Meeting centreColumns = StayIn(dc, columns.centre);
+    if (columns.Overlap()) {
+        regions.Add(centreRows, StayIn(dc, columns.first));
+        regions.Add(centreRows, StayIn(dc, columns.last));
+    } else {
+        regions.Add(centreRows, StayIn(dc, columns.first, columns.centre, columns.last));
+    }
+    if (rows.Overlap()) {
+        regions.Add(StayIn(dr, rows.first), centreColumns);
+        regions.Add(StayIn(dr, rows.last), centreColumns);
+    } else {
+        regions.Add(StayIn(dr, rows.first, rows.last), centreColumns);
+    }
+    return regions;
 }
 
-// One axis of a block under a shift: where the compared stretches start in both frames, and their
-// length. The previous frame's pixel lies shift pixels behind the current frame's.
-struct Stretch {
-    int32_t prev;
-    int32_t curr;
-    int32_t length;
+// The test of one pair of frames.
+struct ShiftTest {
+    const LaidFrame& prev;
+    const LaidFrame& curr;
+    const NoMoveLimits& limits;
+    Bands rows;
+    Bands columns;
+
+    bool AreaCounts(int32_t area) const { return area >= 1 && area >= limits.overlapAreaMin; }
+    int32_t Area(const Regions& regions) const;
+    // A bound of Area: the pixels of the regions, or the finger area of a frame when no pixel
+    // counts more than twice.
+    int64_t MostArea(const Regions& regions) const;
+    int64_t Sum(const Regions& regions, int64_t limit) const;
+    bool IsBelowTolerance(const Regions& regions, int32_t area) const;
 };
 
-Stretch ShiftAxis(int32_t start, int32_t length, int32_t shift) {
-    return {WrapAdd(start, std::max(shift, 0)), WrapAdd(start, std::max(-shift, 0)),
-            WrapSub(length, WrapAbs(shift))};
+constexpr int32_t kAreaUnknown = -1;
+
+int32_t ShiftTest::Area(const Regions& regions) const {
+    int32_t area = 0;
+    for (int32_t i = 0; i < regions.count; ++i)
+        area += CommonArea(prev, curr, regions.At(i));
+    return area;
 }
 
-// Both stretches lie in the side pixels of an axis, and are not empty.
-bool Inside(const Stretch& stretch, int32_t side) {
-    return stretch.prev >= 0 && stretch.curr >= 0 && stretch.length >= 1 &&
-           stretch.length <= side - std::max(stretch.prev, stretch.curr);
+int64_t ShiftTest::MostArea(const Regions& regions) const {
+    int64_t pixels = 0;
+    for (int32_t i = 0; i < regions.count; ++i)
+        pixels += int64_t{regions.rows[i].places} * regions.columns[i].places;
+    const int64_t times = rows.Overlap() || columns.Overlap() ? 2 : 1;
+    return std::min(pixels, times * std::min(prev.area, curr.area));
 }
 
-void CompareBlock(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr, const Stretch& rows,
-                  const Stretch& columns, Overlap* overlap) {
-    for (int32_t r = 0; r < rows.length; ++r) {
-        const int32_t idx1 = (rows.prev + r) * img_prev->width + columns.prev;
-        const int32_t idx2 = (rows.curr + r) * img_curr->width + columns.curr;
-        for (int32_t c = 0; c < columns.length; ++c) {
-            if (img_prev->pType[idx1 + c] != 1 || img_curr->pType[idx2 + c] != 1)
-                continue;
-            ++overlap->area;
-            overlap->sum = WrapAdd(overlap->sum,
-                                   GreyDiff(img_prev->pData[idx1 + c], img_curr->pData[idx2 + c]));
+int64_t ShiftTest::Sum(const Regions& regions, int64_t limit) const {
+    int64_t sum = 0;
+    for (int32_t i = 0; i < regions.count && sum < limit; ++i)
+        sum += DifferenceSum(prev, curr, regions.At(i), limit - sum);
+    return sum;
+}
+
+// mean < tolerance means sum < tolerance * area: a sum that reaches the product with an area too
+// large is not below. A sum that may wrap is taken in full.
+bool ShiftTest::IsBelowTolerance(const Regions& regions, int32_t area) const {
+    const int64_t most = MostArea(regions);
+    const bool mayWrap = most * kGreyMax > std::numeric_limits<int32_t>::max();
+    const int64_t limit =
+        mayWrap ? std::numeric_limits<int64_t>::max() : int64_t{limits.diffTol} * most;
+    const int64_t sum = Sum(regions, limit);
+    if (sum >= limit)
+        return false;
+    if (area == kAreaUnknown)
+        area = Area(regions);
+    return AreaCounts(area) && Wrap(sum) / area < limits.diffTol;
+}
+
+// Calls visit with every shift within the limits, first with none at all, until it returns true.
+// Returns whether it did.
+template <typename Visit>
+bool VisitShifts(const LaidFrame& frame, const NoMoveLimits& limits, Visit visit) {
+    if (limits.tolRow < 0 || limits.tolCol < 0)  // no shift at all
+        return false;
+    // Beyond the frame's sides no pixel meets another.
+    const int32_t drMax = std::min(limits.tolRow, frame.height);
+    const int32_t dcMax = std::min(limits.tolCol, frame.width);
+    if (visit(0, 0))
+        return true;
+    for (int32_t dr = -drMax; dr <= drMax; ++dr) {
+        for (int32_t dc = -dcMax; dc <= dcMax; ++dc) {
+            if ((dr != 0 || dc != 0) && visit(dr, dc))
+                return true;
         }
     }
-}
-
-Overlap CompareShifted(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr,
-                       const Block (&blocks)[kBlockNum], int32_t dr, int32_t dc) {
-    Overlap overlap = {0, 0};
-    for (const Block& block : blocks) {
-        const Stretch rows = ShiftAxis(block.i_start, block.height, dr);
-        const Stretch columns = ShiftAxis(block.j_start, block.width, dc);
-        if (Inside(rows, img_prev->height) && Inside(columns, img_prev->width))
-            CompareBlock(img_prev, img_curr, rows, columns, &overlap);
-    }
-    return overlap;
-}
-
-// Least mean difference of all shifts that have enough common finger area; kMinNone without one.
-int32_t LeastDifference(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
-    Block blocks[kBlockNum];
-    CutBlocks(img_prev->width, img_prev->height, blocks);
-    const int32_t dr_max = s_smallMoveTolRow;
-    const int32_t dc_max = s_smallMoveTolCol;
-    int32_t min = kMinNone;
-    if (dr_max < 0 || dc_max < 0)  // no shift at all
-        return min;
-    for (int32_t dr = -dr_max; dr <= dr_max; ++dr) {
-        for (int32_t dc = -dc_max; dc <= dc_max; ++dc) {
-            const Overlap overlap = CompareShifted(img_prev, img_curr, blocks, dr, dc);
-            if (overlap.area >= 1 && overlap.area >= s_overlapAreaMinNoMove)
-                min = std::min(min, overlap.sum / overlap.area);
-        }
-    }
-    return min;
-}
-
-// Outcome of the least difference of all shifts.
-int32_t Judge(int32_t min) {
-    if (min < s_diffThresholdTol)
-        return kNoMoveResting;
-    return min == kMinNone ? kNoMoveUndetermined : kNoMoveMoved;
+    return false;
 }
 
 }  // namespace
 
+NoMoveLimits CurrentNoMoveLimits() {
+    return {s_boundWidth,      s_boundHeight,          s_smallMoveTolRow,
+            s_smallMoveTolCol, s_overlapAreaMinNoMove, s_diffThresholdTol};
+}
+
+int32_t TestNoMove(const LaidFrame& prev, const LaidFrame& curr, const NoMoveLimits& limits) {
+    const ShiftTest test = {prev, curr, limits, CutBands(prev.height, limits.boundHeight),
+                            CutBands(prev.width, limits.boundWidth)};
+    bool counted = false;
+    const auto visit = [&](int32_t dr, int32_t dc) {
+        const Regions regions = ShiftRegions(test.rows, test.columns, dr, dc);
+        const int32_t area = counted ? kAreaUnknown : test.Area(regions);
+        counted = counted || test.AreaCounts(area);
+        return test.IsBelowTolerance(regions, area);
+    };
+    if (VisitShifts(prev, limits, visit))
+        return kNoMoveResting;
+    if (!counted && kMeanNone < limits.diffTol)
+        return kNoMoveResting;
+    return counted ? kNoMoveMoved : kNoMoveUndetermined;
+}
+
 int32_t FingerNoMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
-    if (!HasPixels(img_prev) || !HasPixels(img_curr) || img_prev->width != img_curr->width ||
-        img_prev->height != img_curr->height)
+    if (!AreComparable(img_prev, img_curr))
         return kNoMoveFailed;
-    if (CanTestShifts(*img_prev))
-        return TestShifts(*img_prev, *img_curr);
-    return Judge(LeastDifference(img_prev, img_curr));
+    return TestNoMove(LayOut(*img_prev), LayOut(*img_curr), CurrentNoMoveLimits());
 }
 
 }  // namespace fpnavi

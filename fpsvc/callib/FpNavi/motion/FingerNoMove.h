@@ -5,6 +5,7 @@
 #include <cstdint>
 
 #include "FpNavi.h"
+#include "frame/FramePair.h"
 
 namespace fpnavi {
 
@@ -14,9 +15,21 @@ inline constexpr int32_t kNoMoveResting = 0;       // some small shift makes the
 inline constexpr int32_t kNoMoveMoved = 1;         // none does
 inline constexpr int32_t kNoMoveUndetermined = 2;  // no shift has enough common finger area
 
-// Start of the least mean difference: above every mean of 8-bit differences, so that it stands for
-// no shift counted.
-inline constexpr int32_t kMinNone = 256;
+// What the test reads of the parameters.
+struct NoMoveLimits {
+    int32_t boundWidth;      // pixels of the left and right border band
+    int32_t boundHeight;     // pixels of the top and bottom border band
+    int32_t tolRow;          // largest shift, rows
+    int32_t tolCol;          // largest shift, columns
+    int32_t overlapAreaMin;  // pixels that are finger in both frames, for a shift to count
+    int32_t diffTol;         // mean grey difference that means rest when it is below
+};
+
+NoMoveLimits CurrentNoMoveLimits();
+
+// Compares the frames, which have pixels and are of one size, at every shift within the limits.
+// Returns one of the outcomes above.
+int32_t TestNoMove(const LaidFrame& prev, const LaidFrame& curr, const NoMoveLimits& limits);
 
 // Compares the frames at every shift within s_smallMoveTolRow and s_smallMoveTolCol. Returns one
 // of the outcomes above.

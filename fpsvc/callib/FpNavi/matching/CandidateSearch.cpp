@@ -1,0 +1,159 @@
+// Requirement: the displacements of the num smallest keys of all placements.
+// Observation: a key is ordered by difference, row, column and template. With rows outside, columns
+// inside and templates innermost, placements of equal difference come in ascending order of keys.
+// Algorithm: count the placements by difference, which gives the worst difference that is kept and
+// how many placements of it are wanted; then take all better ones, and the first of these.
+#include "matching/CandidateSearch.h"
+
+#include <algorithm>
+#include <cstdlib>
+
+#include "base/BitRows.h"
+#include "base/GreyHistogram.h"
+#include "base/NaviMath.h"
+#include "frame/NaviFrame.h"
+#include "matching/CandidateHeap.h"
+
+namespace fpnavi {
+namespace {
+
+// What is kept of the placements.
+struct Cut {
+    int32_t worst;   // difference of the worst placement that is kept
+    int32_t wanted;  // placements of exactly that difference
+};
+
+Cut CutDifferences(const PlacementTables& tables, int32_t num) {
+    int32_t counts[kGreyLevels];
+    CountBytes(tables.of[0].diff, tables.Count(), counts);
+    int32_t below = 0;
+    int32_t worst = 0;
+    while (worst < kDiffKept && below + counts[worst] < num)
+        below += counts[worst++];
+    return {worst, num - below};
+}
+
+// A template that is placed, and the displacement of a placement at (0, 0) of its table.
+struct Placed {
+    PlacementTable table;
+    Displacement origin;
+};
+
+// Takes what is kept, in ascending order of rows, columns and templates.
+class Selection {
+  public:
+    Selection(const TemplateSet& set, const PlacementTables& tables, const Candidates& candidates)
+        : m_sentinel(DisplacementOf(set, kKeySentinel)),
+          m_candidates(candidates),
+          m_cut(CutDifferences(tables, candidates.num)) {
+        for (int32_t k = 0; k < kTpltMax; ++k) {
+            const PlacementTable& table = tables.of[k];
+            if (table.rows == 0)
+                continue;
+            m_placed[m_count++] = {table,
+                                   DisplacementOf(set, MakeKey(0, table.iFirst, table.jFirst, k))};
+            m_rows = std::max(m_rows, table.rows);
+            m_columns = std::max(m_columns, table.columns);
+        }
+    }
+
+    void TakeAll() {
+        for (int32_t row = 0; row < m_rows; ++row) {
+            for (int32_t column = 0; column < m_columns; column += kWordPixels)
+                TakeRow(row, column);
+        }
+        PutBestFirst();
+    }
+
+  private:
+    // Takes from 64 columns of a row. kept: a bit for each placement that differs by at most worst.
+    void TakeRow(int32_t row, int32_t column) {
+        uint64_t kept[kTpltMax];
+        uint64_t any = 0;
+        for (int32_t t = 0; t < m_count; ++t) {
+            kept[t] = FindKept(m_placed[t].table, row, column);
+            any |= kept[t];
+        }
+        for (; any != 0; any &= any - 1) {
+            const int32_t bit = __builtin_ctzll(any);
+            for (int32_t t = 0; t < m_count; ++t) {
+                if ((kept[t] >> bit & 1U) != 0)
+                    Take(m_placed[t], row, column + bit);
+            }
+        }
+    }
+
+    uint64_t FindKept(const PlacementTable& table, int32_t row, int32_t column) const {
+        if (row >= table.rows || column >= table.columns)
+            return 0;
+        return AtMostBits(table.diff + row * table.columns + column,
+                          std::min(table.columns - column, kWordPixels),
+                          static_cast<uint8_t>(m_cut.worst));
+    }
+
+    void Take(const Placed& placed, int32_t row, int32_t column) {
+        const int32_t diff = placed.table.diff[row * placed.table.columns + column];
+        if (diff == m_cut.worst && m_cut.wanted-- <= 0)
+            return;
+        if (diff < m_bestDiff) {
+            m_bestDiff = diff;
+            m_best = m_taken;
+        }
+        m_candidates.Set(m_taken++,
+                         {WrapAdd(placed.origin.di, row), WrapAdd(placed.origin.dj, column)});
+    }
+
+    // The best placement mostly matches best, and then the others stop early.
+    void PutBestFirst() {
+        while (m_taken < m_candidates.num)
+            m_candidates.Set(m_taken++, m_sentinel);
+        const Displacement best = m_candidates.At(m_best);
+        m_candidates.Set(m_best, m_candidates.At(0));
+        m_candidates.Set(0, best);
+    }
+
+    const Displacement m_sentinel;
+    const Candidates m_candidates;
+    Cut m_cut;
+    Placed m_placed[kTpltMax];
+    int32_t m_count = 0;
+    int32_t m_rows = 0;  // most of all tables
+    int32_t m_columns = 0;
+    int32_t m_taken = 0;
+    int32_t m_best = 0;
+    int32_t m_bestDiff = kGreyLevels;
+};
+
+}  // namespace
+
+void SelectCandidates(const TemplateSet& set, const PlacementTables& tables,
+                      const Candidates& candidates) {
+    Selection(set, tables, candidates).TakeAll();
+}
+
+void ConvertKeys(const TemplateSet& set, const uint32_t* keys, const Candidates& candidates) {
+    for (int32_t m = 0; m < candidates.num; ++m)
+        candidates.Set(m, DisplacementOf(set, keys[m]));
+}
+
+int32_t FindCandidate(int32_t* candidate_di, int32_t* candidate_dj) {
+    const SearchParams params = CurrentSearchParams();
+    if (candidate_di == nullptr || candidate_dj == nullptr || params.candidateNum < 1 ||
+        !AreComparable(&s_imagePrev, &s_imageCurr))
+        return -1;
+    const FramePair pair = LayOutPair(s_imagePrev, s_imageCurr);
+    TemplateSet set;
+    if (!CutTemplates(params, pair, &set))
+        return -1;
+    auto* const candidateList =
+        static_cast<uint8_t*>(std::malloc(PlanMemory(params, set, nullptr).bytes));
+    if (candidateList == nullptr)
+        return -1;
+    const SearchMemory memory = PlanMemory(params, set, candidateList);
+    RankCandidates(ScorePlacements(params, set, pair, memory), memory.keys, params.candidateNum);
+    ConvertKeys(set, memory.keys, {candidate_di, candidate_dj, params.candidateNum});
+    std::free(candidateList);
+    return 0;
+}
+
+}  // namespace fpnavi

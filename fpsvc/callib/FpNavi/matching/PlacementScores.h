@@ -1,0 +1,48 @@
+// The mean grey differences of all placements of the templates. Owns nothing: the tables and all
+// scratch lie in one block of memory that the caller allocates for a search.
+#ifndef FPNAVI_PLACEMENTSCORES_H
+#define FPNAVI_PLACEMENTSCORES_H
+
+#include <cstdint>
+
+#include "matching/Templates.h"
+
+namespace fpnavi {
+
+// Mean grey differences of the placements of one template, row by row. The tables of a search
+// follow each other in memory.
+struct PlacementTable {
+    int32_t iFirst;
+    int32_t jFirst;
+    int32_t rows;  // 0 for a template that is not placed
+    int32_t columns;
+    uint8_t* diff;  // rows * columns
+
+    int32_t Count() const { return rows * columns; }
+};
+
+// The memory of one candidate search.
+struct SearchMemory {
+    uint32_t* keys;   // one for each candidate
+    uint8_t* packed;  // the templates' pieces
+    uint8_t* strips;  // of the searched frame
+    uint32_t* sums;   // of placements of templates of more than one piece
+    uint8_t* scores;  // all tables, and 15 bytes that a step of sixteen may read
+    size_t bytes;     // of all
+};
+
+// Plans the memory of a search. Without a block only the number of bytes is meant.
+SearchMemory PlanMemory(const SearchParams& params, const TemplateSet& set, uint8_t* block);
+
+struct PlacementTables {
+    PlacementTable of[kTpltMax];
+    int32_t Count() const;  // placements of all templates
+};
+
+// Scores all placements of the valid templates of set in pair.Searched().
+PlacementTables ScorePlacements(const SearchParams& params, const TemplateSet& set,
+                                const FramePair& pair, const SearchMemory& memory);
+
+}  // namespace fpnavi
+
+#endif  // FPNAVI_PLACEMENTSCORES_H
