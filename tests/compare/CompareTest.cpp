@@ -212,6 +212,33 @@ TEST(CompareTuning, RunsOfAllModes) {
     }
 }
 
+// Block sizes and counts of either sign whose products are those of a small image. The frame is no
+// larger than the sides say.
+TEST(CompareTuning, BlockFactorsOfAnySign) {
+    Twin& twin = Twin::Get();
+    for (uint32_t signs = 0; signs < 16; ++signs) {
+        for (const int32_t height : {9, 5}) {  // 5 * 4 * 56 divides by 16, 5 * 3 * 56 does not
+            for (const int32_t rows : {4, 3}) {
+                host::ParamBlock params = host::ParamsForMode(Mode::Fp, false);
+                const auto set = [&](const char* name, int32_t value, uint32_t sign) {
+                    host::ParamValue(params, name) = (signs >> sign & 1U) != 0 ? -value : value;
+                };
+                set("s_blockWidthFp", 8, 0);
+                set("s_blockColNumFp", 7, 1);
+                set("s_blockHeightFp", height, 2);
+                set("s_blockRowNumFp", rows, 3);
+                twin.SetParam(&params);
+                const bool image = signs == 0;
+                const std::vector<uint8_t> frame(image ? 8 * 7 * 9 * 4 : 1, 230);
+                twin.SetDac(200);
+                twin.Tune(frame, 0x00020700U, 0x00000102U);
+                twin.Tune(frame, 0x00020700U, 0x00000102U);
+                ASSERT_FALSE(twin.Difference()) << *twin.Difference() << ", signs " << signs;
+            }
+        }
+    }
+}
+
 TEST(CompareNullParameters, AreRefusedAlike) {
     Twin::Get().SetParam(nullptr);
     EXPECT_FALSE(Twin::Get().Difference());

@@ -4,6 +4,7 @@
 
 #include "base/NaviMath.h"
 #include "gesture/Gesture.h"
+#include "param/NaviLimits.h"
 #include "param/NaviParam.h"
 #include "tuning/TuneHistogram.h"
 #include "tuning/TuneStep.h"
@@ -66,10 +67,10 @@ bool Saturated(uint32_t grey) {
     return WrapSubU(grey, 10) > 240;
 }
 
-// The frame can be measured: it has pixels whose number fits 32 bits, and every table is indexed
-// inside.
+// The frame can be measured: it has blocks of pixels whose number fits 32 bits, and every table is
+// indexed inside.
 bool FrameUsable(uint32_t gainCode) {
-    return sImgSizeInfo.iWidth >= 1 && sImgSizeInfo.iHeight >= 1 &&
+    return BlockFactorsPositive() && sImgSizeInfo.iWidth >= 1 && sImgSizeInfo.iHeight >= 1 &&
            sImgSizeInfo.iWidth <= std::numeric_limits<int32_t>::max() / sImgSizeInfo.iHeight &&
            _NAVI_blk_selection_mode >= 0 && _NAVI_blk_selection_mode <= 3 &&
            GainCodesUsable(gainCode);
