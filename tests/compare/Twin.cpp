@@ -13,8 +13,6 @@
 #include "param/NaviLimits.h"
 #include "param/NaviParam.h"
 #include "tuning/Tune.h"
-#include "tuning/TuneHistogram.h"
-#include "tuning/TuneStep.h"
 
 namespace fpnavi_test {
 namespace {
