@@ -4,7 +4,9 @@
 // FPNAVI_COMPARE_SEED another seed.
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <cstdlib>
+#include <iterator>
 
 #include "RandomGesture.h"
 #include "SimCorpus.h"
@@ -171,6 +173,45 @@ TEST(CompareFailedAllocations, EveryAllocationOfALaterFrame) {
         twin.Vote(1);
         ASSERT_FALSE(twin.Difference()) << *twin.Difference() << " of gesture " << i;
     }
+}
+
+// Simulated gestures during which the host writes counts of pairs into the record, with all log
+// lines of the votes.
+void ReplayWithWrittenCounts(uint64_t test, Mode mode, int64_t percent) {
+    Twin& twin = Twin::Get();
+    const int64_t count = Gestures(percent);
+    const int32_t counts[] = {INT32_MIN, -100, -1, 0, 1, 97, 98, 99, 100, 101, 1503, INT32_MAX};
+    for (int64_t i = 0; i < count; ++i) {
+        SimRandom random(SeedOf(test, i));
+        const host::SimPlan plan = host::RandomPlan(random.Next(), mode);
+        const host::Gesture gesture = host::Simulate(plan, "compared");
+        host::ParamBlock params = gesture.params;
+        host::ParamValue(params, "s_logShowFlag") = 1;
+        twin.SetParam(&params);
+        twin.Clear();
+        for (const host::RecordedFrame& frame : gesture.frames) {
+            if (random.Chance(40))
+                twin.SetPairCount(counts[random.Below(static_cast<int32_t>(std::size(counts)))]);
+            if (mode == Mode::DoubleScan)
+                twin.Zones(frame.reg24, frame.reg28);
+            twin.Block(frame.raw, gesture.geometry.Width());
+            twin.Status();
+            twin.Frame(0);
+            if (random.Chance(30))
+                twin.Vote(1);
+        }
+        ASSERT_FALSE(twin.Difference()) << *twin.Difference() << " of gesture " << i;
+    }
+}
+
+TEST(CompareWrittenPairCounts, FpMode) {
+    ReplayWithWrittenCounts(61, Mode::Fp, 3);
+}
+TEST(CompareWrittenPairCounts, HgMode) {
+    ReplayWithWrittenCounts(62, Mode::Hg, 3);
+}
+TEST(CompareWrittenPairCounts, DoubleScanMode) {
+    ReplayWithWrittenCounts(63, Mode::DoubleScan, 3);
 }
 
 // Tuning runs with gestures between them.

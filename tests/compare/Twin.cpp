@@ -113,6 +113,11 @@ void Twin::SetDac(uint32_t value) {
     m_dacReference = value;
 }
 
+void Twin::SetPairCount(int32_t calc_cnt) {
+    ::PrintNaviLog()->calc_cnt = calc_cnt;
+    reference::PrintNaviLog()->calc_cnt = calc_cnt;
+}
+
 void Twin::FailAllocation(int32_t number, bool forGood) {
     m_failing = number;
     m_failingForGood = forGood;

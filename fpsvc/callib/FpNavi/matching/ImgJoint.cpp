@@ -58,7 +58,7 @@ int32_t JudgeMatch(int32_t dx, int32_t dy, int32_t diff) {
 }
 
 void RecordMatch(int32_t dx, int32_t dy, int32_t diff) {
-    const int32_t calc_cnt = s_voteInfo.calc_cnt;
+    const int32_t calc_cnt = PairCount(s_voteInfo);
     const bool percent = s_dimensionlessFlag == 1 && s_sensorWidth > 0 && s_sensorHeight > 0;
     s_voteInfo.dx_fp[calc_cnt] = percent ? WrapMul(100, dx) / s_sensorWidth : dx;
     s_voteInfo.dy_fp[calc_cnt] = percent ? WrapMul(100, dy) / s_sensorHeight : dy;
