@@ -7,8 +7,6 @@
 #include "FpNavi.h"
 #include "param/NaviParam.h"
 #include "tuning/Tune.h"
-#include "tuning/TuneHistogram.h"
-#include "tuning/TuneStep.h"
 
 namespace host {
 namespace {

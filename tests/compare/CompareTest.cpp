@@ -4,7 +4,9 @@
 // FPNAVI_COMPARE_SEED another seed.
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <cstdlib>
+#include <iterator>
 
 #include "RandomGesture.h"
 #include "SimCorpus.h"
@@ -173,6 +175,45 @@ TEST(CompareFailedAllocations, EveryAllocationOfALaterFrame) {
     }
 }
 
+// Simulated gestures during which the host writes counts of pairs into the record, with all log
+// lines of the votes.
+void ReplayWithWrittenCounts(uint64_t test, Mode mode, int64_t percent) {
+    Twin& twin = Twin::Get();
+    const int64_t count = Gestures(percent);
+    const int32_t counts[] = {INT32_MIN, -100, -1, 0, 1, 97, 98, 99, 100, 101, 1503, INT32_MAX};
+    for (int64_t i = 0; i < count; ++i) {
+        SimRandom random(SeedOf(test, i));
+        const host::SimPlan plan = host::RandomPlan(random.Next(), mode);
+        const host::Gesture gesture = host::Simulate(plan, "compared");
+        host::ParamBlock params = gesture.params;
+        host::ParamValue(params, "s_logShowFlag") = 1;
+        twin.SetParam(&params);
+        twin.Clear();
+        for (const host::RecordedFrame& frame : gesture.frames) {
+            if (random.Chance(40))
+                twin.SetPairCount(counts[random.Below(static_cast<int32_t>(std::size(counts)))]);
+            if (mode == Mode::DoubleScan)
+                twin.Zones(frame.reg24, frame.reg28);
+            twin.Block(frame.raw, gesture.geometry.Width());
+            twin.Status();
+            twin.Frame(0);
+            if (random.Chance(30))
+                twin.Vote(1);
+        }
+        ASSERT_FALSE(twin.Difference()) << *twin.Difference() << " of gesture " << i;
+    }
+}
+
+TEST(CompareWrittenPairCounts, FpMode) {
+    ReplayWithWrittenCounts(61, Mode::Fp, 3);
+}
+TEST(CompareWrittenPairCounts, HgMode) {
+    ReplayWithWrittenCounts(62, Mode::Hg, 3);
+}
+TEST(CompareWrittenPairCounts, DoubleScanMode) {
+    ReplayWithWrittenCounts(63, Mode::DoubleScan, 3);
+}
+
 // Tuning runs with gestures between them.
 TEST(CompareTuning, RunsOfAllModes) {
     Twin& twin = Twin::Get();
@@ -209,6 +250,33 @@ TEST(CompareTuning, RunsOfAllModes) {
                 twin.Clear();
         }
         ASSERT_FALSE(twin.Difference()) << *twin.Difference() << " of run " << i;
+    }
+}
+
+// Block sizes and counts of either sign whose products are those of a small image. The frame is no
+// larger than the sides say.
+TEST(CompareTuning, BlockFactorsOfAnySign) {
+    Twin& twin = Twin::Get();
+    for (uint32_t signs = 0; signs < 16; ++signs) {
+        for (const int32_t height : {9, 5}) {  // 5 * 4 * 56 divides by 16, 5 * 3 * 56 does not
+            for (const int32_t rows : {4, 3}) {
+                host::ParamBlock params = host::ParamsForMode(Mode::Fp, false);
+                const auto set = [&](const char* name, int32_t value, uint32_t sign) {
+                    host::ParamValue(params, name) = (signs >> sign & 1U) != 0 ? -value : value;
+                };
+                set("s_blockWidthFp", 8, 0);
+                set("s_blockColNumFp", 7, 1);
+                set("s_blockHeightFp", height, 2);
+                set("s_blockRowNumFp", rows, 3);
+                twin.SetParam(&params);
+                const bool image = signs == 0;
+                const std::vector<uint8_t> frame(image ? 8 * 7 * 9 * 4 : 1, 230);
+                twin.SetDac(200);
+                twin.Tune(frame, 0x00020700U, 0x00000102U);
+                twin.Tune(frame, 0x00020700U, 0x00000102U);
+                ASSERT_FALSE(twin.Difference()) << *twin.Difference() << ", signs " << signs;
+            }
+        }
     }
 }
 

@@ -13,8 +13,6 @@
 #include "param/NaviLimits.h"
 #include "param/NaviParam.h"
 #include "tuning/Tune.h"
-#include "tuning/TuneHistogram.h"
-#include "tuning/TuneStep.h"
 
 namespace fpnavi_test {
 namespace {
@@ -113,6 +111,11 @@ void Twin::SetImage(const std::vector<uint8_t>& image) {
 void Twin::SetDac(uint32_t value) {
     m_dac = value;
     m_dacReference = value;
+}
+
+void Twin::SetPairCount(int32_t calc_cnt) {
+    ::PrintNaviLog()->calc_cnt = calc_cnt;
+    reference::PrintNaviLog()->calc_cnt = calc_cnt;
 }
 
 void Twin::FailAllocation(int32_t number, bool forGood) {

@@ -76,6 +76,13 @@ void FpNaviClear() {
     ImgClear(&s_fullImagePrev);
 }
 
+int32_t PairsOf(const NaviVoteInfo_t& info) {
+    if (info.calc_cnt < 0) {
+        return 0;
+    }
+    return info.calc_cnt > kMaxPairs ? kMaxPairs : info.calc_cnt;
+}
+
 NaviVoteInfo_t* PrintNaviLog() {
     return &s_voteInfo;
 }

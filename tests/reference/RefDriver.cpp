@@ -119,7 +119,7 @@ int32_t FinishFpPair(int32_t n) {
 }  // namespace
 
 int32_t OrntCalcProcess() {
-    const int32_t n = s_voteInfo.calc_cnt;
+    const int32_t n = PairsOf(s_voteInfo);
     if (n >= kMaxPairs) {
         return 0;  // the record is full; its entries stay as they are
     }

@@ -10,6 +10,8 @@
 
 namespace reference {
 
+struct NaviVoteInfo_t;
+
 // Largest side of an image that frames are processed at, in pixels.
 constexpr int32_t kMaxSide = 4096;
 
@@ -44,6 +46,9 @@ void* Allocate(int64_t bytes);
 
 // Replaces each %d of `format` by the next value; values beyond the last %d are not printed.
 std::string FormatValues(const char* format, const std::vector<int32_t>& values);
+
+// How many pairs `info` holds: its calc_cnt, which a host can overwrite, cut to 0..kMaxPairs.
+int32_t PairsOf(const NaviVoteInfo_t& info);
 
 // Appends one line to s_logSink.
 void LogLine(const char* function, int32_t line, const std::string& message);

@@ -121,7 +121,7 @@ int32_t PrepareMatch(int32_t* candidate_i, int32_t* candidate_j) {
 }  // namespace
 
 int32_t CalcImgJoint() {
-    const int32_t calc_cnt = s_voteInfo.calc_cnt;
+    const int32_t calc_cnt = PairsOf(s_voteInfo);
     const int64_t bytes = int64_t{s_candidateNum} * static_cast<int64_t>(sizeof(int32_t));
     int32_t* candidate_i = static_cast<int32_t*>(Allocate(bytes));
     int32_t* candidate_j = static_cast<int32_t*>(Allocate(bytes));

@@ -60,7 +60,7 @@ bool Dominates(int32_t travel, int32_t other) {
 
 int32_t CalcCenterMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr,
                        NaviVoteInfo_t* voteInfo) {
-    const int32_t calc_cnt = voteInfo->calc_cnt;
+    const int32_t calc_cnt = PairsOf(*voteInfo);
     int32_t dx = WrapSub32(img_curr->xc, img_prev->xc);
     int32_t dy = WrapSub32(img_curr->yc, img_prev->yc);
     if (s_dimensionlessFlag == 0) {
@@ -102,12 +102,15 @@ int32_t CalcDoubleScanMove(const uint8_t* pPrev, const uint8_t* pCurr, NaviVoteI
     int32_t xc_cvrr = 0;
     int32_t yc_cvrr = 0;
     int32_t cvr_cvrr = 0;
-    const int32_t calc_cnt = voteInfo->calc_cnt;
+    const int32_t calc_cnt = PairsOf(*voteInfo);
     if (DoubleScanGetCenterAndCoverage(pPrev, &xc_prev, &yc_prev, &cvr_prev) == -1) {
         return -1;
     }
     if (DoubleScanGetCenterAndCoverage(pCurr, &xc_cvrr, &yc_cvrr, &cvr_cvrr) == -1) {
         return -1;
+    }
+    if (calc_cnt >= kMaxPairs) {
+        return -1;  // the current frame has no entry any more
     }
     voteInfo->xc_ds[calc_cnt] = xc_prev;
     voteInfo->yc_ds[calc_cnt] = yc_prev;

@@ -3,6 +3,7 @@
 // of the measured grey levels and the test for completion.
 
 #include <cstring>
+#include <initializer_list>
 
 #include "RefInternal.h"
 #include "RefMath.h"
@@ -112,11 +113,22 @@ void ClassifyMeasurement() {
     _NAVI_flag_non_linear = IsSaturated(_NAVI_mean) && IsSaturated(_NAVI_top_mean) ? 1 : 0;
 }
 
-// A frame of the wrong size fails with its log line before its gains matter. Any other frame whose
-// gain codes point outside the tables is dropped unmeasured and without a line.
+// Sides are products: with two negative factors one is positive and no buffer has it.
+bool HasNegativeOrNoBlocks() {
+    for (const int32_t factor : {s_blockWidth, s_blockHeight, s_blockColNum, s_blockRowNum}) {
+        if (factor < 1) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// A frame of the wrong size fails with its log line before anything else matters. Any other frame
+// without blocks, or whose gain codes point outside the tables, is dropped unmeasured and without
+// a line.
 bool MeasureFrame(const uint8_t* img, uint32_t gainCode) {
     const bool wrongSize = !IsTuneSizeDivisible(sImgSizeInfo.iHeight, sImgSizeInfo.iWidth);
-    if (!wrongSize && !AreGainsUsable(gainCode)) {
+    if (!wrongSize && (HasNegativeOrNoBlocks() || !AreGainsUsable(gainCode))) {
         _NAVI_mean = 0;
         return false;
     }

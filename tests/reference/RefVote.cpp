@@ -73,7 +73,7 @@ int32_t DecideAxis(const VerdictCounts& counts, const Axis& axis, int32_t init, 
 }  // namespace
 
 int32_t Voting_hg_mode() {
-    const int32_t calc_cnt = s_voteInfo.calc_cnt;
+    const int32_t calc_cnt = PairsOf(s_voteInfo);
     const int32_t x_init = s_voteInfo.xc[0];
     const int32_t y_init = s_voteInfo.yc[0];
     const int32_t x_final = s_voteInfo.xc[calc_cnt];

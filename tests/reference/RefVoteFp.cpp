@@ -47,7 +47,7 @@ void Log(int32_t line, const char* format, const std::vector<int32_t>& values) {
 // before the closing brace; readers of the log know the lines like that.
 void LogVoteInformation() {
     const NaviVoteInfo_t& info = s_voteInfo;
-    const int32_t n = info.calc_cnt;
+    const int32_t n = PairsOf(info);
     Log(508, "##################### Vote information ########################\n", {});
     Log(510, "calculate count = %d\n", {n});
     Log(512, "Initial and final centroid position are (%d, %d) and (%d, %d).\n",
@@ -132,14 +132,14 @@ int32_t AddPair(int32_t i, GestureSums* sums) {
 
 // Whether the gesture moved far enough, in enough pairs, for a key.
 bool HasMoved(const GestureSums& sums, int32_t ct_final_distance, int32_t fp_final_distance) {
-    if (s_voteInfo.calc_cnt == 0) {
+    if (PairsOf(s_voteInfo) == 0) {
         return false;
     }
     const int32_t final_ct_and_fp = WrapAdd32(ct_final_distance, fp_final_distance);
     if (final_ct_and_fp <= s_totalMoveThreshold) {
         return false;
     }
-    const int32_t movingPairs = s_voteInfo.calc_cnt - sums.count_of_diff_result;
+    const int32_t movingPairs = PairsOf(s_voteInfo) - sums.count_of_diff_result;
     return movingPairs > 1 || s_directionControlFlag != 1;
 }
 
@@ -184,7 +184,8 @@ int32_t Voting_fp_mode() {
         LogVoteInformation();
     }
     GestureSums sums = {};
-    for (int32_t i = 0; i < s_voteInfo.calc_cnt; ++i) {
+    const int32_t pairs = PairsOf(s_voteInfo);
+    for (int32_t i = 0; i < pairs; ++i) {
         if (AddPair(i, &sums) == -1) {
             return -1;
         }

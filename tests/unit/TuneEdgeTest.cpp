@@ -1,4 +1,4 @@
-// One call of _NAVI_Tune on the thinnest images that can be measured.
+// One call of _NAVI_Tune on the thinnest and on the longest images that can be measured.
 #include <gtest/gtest.h>
 
 #include <vector>
@@ -28,6 +28,23 @@ TEST_F(TuneEdge, ImagesOfOneRowOrOneColumnAreMeasured) {
     registers.dac = 200;
     registers.Tune(std::vector<uint8_t>(16, 11));
     EXPECT_EQ(_NAVI_mean, 44U);
+}
+
+TEST_F(TuneEdge, SidesAbove4096AreMeasured) {
+    // 8192 x 4 pixels: corner blocks of 2048 x 1.
+    Params params;
+    params.Set("s_blockColNumFp", 2).Set("s_blockRowNumFp", 2);
+    params.Set("s_blockWidthFp", 4096).Set("s_blockHeightFp", 2).Apply();
+    Registers registers;
+    registers.dac = 200;
+    registers.Tune(std::vector<uint8_t>(8192 * 4, 170));
+    EXPECT_EQ(_NAVI_mean, 170U);
+    EXPECT_EQ(_NAVI_img_histogram[170], 2048U);
+    params.Set("s_blockWidthFp", 2).Set("s_blockHeightFp", 4096).Apply();
+    registers.dac = 200;
+    registers.Tune(std::vector<uint8_t>(4 * 8192, 171));
+    EXPECT_EQ(_NAVI_mean, 171U);
+    EXPECT_EQ(_NAVI_img_histogram[171], 2048U);
 }
 
 }  // namespace

@@ -11,8 +11,7 @@
 #include "gesture/Gesture.h"
 #include "param/NaviParam.h"
 #include "tuning/Tune.h"
-#include "tuning/TuneHistogram.h"
-#include "tuning/TuneStep.h"
+#include "tuning/TuneRegisters.h"
 
 namespace fpnavi_test {
 

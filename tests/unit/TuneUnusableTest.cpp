@@ -36,9 +36,9 @@ class UnusableFrame : public AfterARun {
         return values;
     }
     // The former frame was too bright, so the DC falls; a mean of 0 says 18000 / 374 = 48.
-    void ExpectUnusable(int32_t lines) {
+    void ExpectUnusable(int32_t lines, const std::vector<uint8_t>& frame = Flat(180)) {
         LogCapture log;
-        EXPECT_EQ(m_registers.Tune(Flat(180)), 1) << "the second call of the run";
+        EXPECT_EQ(m_registers.Tune(frame), 1) << "the second call of the run";
         EXPECT_EQ(_NAVI_mean, 0U);
         EXPECT_EQ(Measurement(), m_before);
         EXPECT_EQ(m_registers.dac, 152U);
@@ -108,6 +108,41 @@ TEST_F(UnusableFrame, WidthOrHeightBelow1) {
             Params().Set(side, pixels).Apply();
             ExpectUnusable(0);
         }
+    }
+}
+
+// Two factors below 0 make a side above 0. No buffer has that size: the frame here is one byte.
+TEST_F(UnusableFrame, TwoNegativeBlockFactorsAreNoImage) {
+    const std::vector<uint8_t> oneByte(1, 180);
+    const auto expectUnusable = [&](const Params& params) {
+        SetUp();
+        params.Apply();
+        ASSERT_EQ(s_imageWidth, 56);
+        ASSERT_EQ(s_imageHeight, 36);
+        ExpectUnusable(0, oneByte);
+    };
+    const Params width = Params().Set("s_blockWidthFp", -8).Set("s_blockColNumFp", -7);
+    const Params height = Params().Set("s_blockHeightFp", -9).Set("s_blockRowNumFp", -4);
+    expectUnusable(width);
+    expectUnusable(height);
+    expectUnusable(Params(width).Set("s_blockHeightFp", -9).Set("s_blockRowNumFp", -4));
+}
+
+TEST_F(UnusableFrame, WrongSizeOfNegativeBlockFactorsIsLogged) {
+    Params().Set("s_blockWidthFp", -5).Set("s_blockColNumFp", -7).Set("s_blockHeightFp", 3).Apply();
+    ASSERT_NE(s_imageWidth * s_imageHeight % 16, 0);
+    ExpectUnusable(1, std::vector<uint8_t>(1, 180));
+}
+
+TEST_F(UnusableFrame, SideOfPositiveFactorsThatWrapsBelow1) {
+    // 65536 * 32768 = 2^31, 65536 * 65536 = 2^32: -2^31 and 0 pixels.
+    for (const int32_t count : {32768, 65536}) {
+        SetUp();
+        Params().Set("s_blockWidthFp", 65536).Set("s_blockColNumFp", count).Apply();
+        ExpectUnusable(0);
+        SetUp();
+        Params().Set("s_blockHeightFp", 65536).Set("s_blockRowNumFp", count).Apply();
+        ExpectUnusable(0);
     }
 }
 

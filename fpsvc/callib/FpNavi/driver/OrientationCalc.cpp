@@ -99,7 +99,7 @@ int32_t CompareFingerprints(int32_t n) {
 }  // namespace
 
 int32_t OrntCalcProcess() {
-    const int32_t n = s_voteInfo.calc_cnt;
+    const int32_t n = PairCount(s_voteInfo);
     if (n >= kPairMax)
         return 0;
     if (s_modeFlag != 1 && !PairWorkAcceptable())
@@ -121,7 +121,7 @@ int32_t OrntCalcProcess() {
     } else if (CompareFingerprints(n) != 0) {
         return -1;
     }
-    ++s_voteInfo.calc_cnt;
+    s_voteInfo.calc_cnt = n + 1;
     return 0;
 }
 

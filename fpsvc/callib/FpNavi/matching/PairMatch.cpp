@@ -27,7 +27,7 @@ int32_t JudgeMatch(const Move& move, int32_t diff) {
 }
 
 void RecordMatch(const Move& move, int32_t diff) {
-    const int32_t calc_cnt = s_voteInfo.calc_cnt;
+    const int32_t calc_cnt = PairCount(s_voteInfo);
     const bool percent = s_dimensionlessFlag == 1 && s_sensorWidth > 0 && s_sensorHeight > 0;
     s_voteInfo.dx_fp[calc_cnt] = percent ? WrapMul(100, move.dx) / s_sensorWidth : move.dx;
     s_voteInfo.dy_fp[calc_cnt] = percent ? WrapMul(100, move.dy) / s_sensorHeight : move.dy;

@@ -5,6 +5,7 @@
 #include "base/NaviMath.h"
 #include "base/NaviSimd.h"
 #include "frame/NaviFrame.h"
+#include "gesture/NaviVoteInfo.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -85,7 +86,7 @@ int32_t GetCenterAndCoverage(NaviFrame_t* img) {
 
 int32_t CalcCenterMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr,
                        NaviVoteInfo_t* voteInfo) {
-    const int32_t calc_cnt = voteInfo->calc_cnt;
+    const int32_t calc_cnt = PairCount(*voteInfo);
     // Percentages: differences within +-100, so all products below stay small.
     int32_t dx = img_curr->xc - img_prev->xc;
     int32_t dy = img_curr->yc - img_prev->yc;

@@ -2,6 +2,8 @@
 
 #include <cstring>
 
+#include "gesture/NaviVoteInfo.h"
+
 namespace fpnavi {
 
 uint8_t DoubleScanZonePrev[kZoneCells];
@@ -41,7 +43,9 @@ int32_t CalcDoubleScanMove(const uint8_t* pPrev, const uint8_t* pCurr, NaviVoteI
         return -1;
     if (DoubleScanGetCenterAndCoverage(pCurr, &xc_cvrr, &yc_cvrr, &cvr_cvrr) != 0)
         return -1;
-    const int32_t calc_cnt = voteInfo->calc_cnt;
+    const int32_t calc_cnt = PairCount(*voteInfo);
+    if (calc_cnt == kPairCountMax)
+        return -1;
     voteInfo->xc_ds[calc_cnt] = xc_prev;
     voteInfo->yc_ds[calc_cnt] = yc_prev;
     voteInfo->cvr_ds[calc_cnt] = cvr_prev;

@@ -20,7 +20,7 @@ int32_t DoubleScanGetCenterAndCoverage(const uint8_t* DoubleScanZone, int32_t* x
                                        int32_t* cvr);
 
 // Writes the pair's double-scan entries of voteInfo at calc_cnt (frame entries also at calc_cnt +
-// 1). Returns 0, or -1 with nothing written when a map cannot be measured.
+// 1). Returns 0, or -1 with nothing written when a map cannot be measured or all pairs are counted.
 int32_t CalcDoubleScanMove(const uint8_t* pPrev, const uint8_t* pCurr, NaviVoteInfo_t* voteInfo);
 
 }  // namespace fpnavi

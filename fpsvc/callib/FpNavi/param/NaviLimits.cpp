@@ -51,9 +51,12 @@ int64_t NoMoveWork() {
 
 }  // namespace
 
+bool BlockFactorsPositive() {
+    return s_blockWidth >= 1 && s_blockHeight >= 1 && s_blockColNum >= 1 && s_blockRowNum >= 1;
+}
+
 bool ImageGeometryUsable() {
-    return s_blockWidth >= 1 && s_blockHeight >= 1 && s_blockColNum >= 1 && s_blockRowNum >= 1 &&
-           SideUsable(int64_t{s_blockWidth} * s_blockColNum) &&
+    return BlockFactorsPositive() && SideUsable(int64_t{s_blockWidth} * s_blockColNum) &&
            SideUsable(int64_t{s_blockHeight} * s_blockRowNum);
 }
 

@@ -6,8 +6,11 @@
 
 namespace fpnavi {
 
-// Block sizes and counts are positive and both image sides lie in 1..4096, without a wrap of the
-// product of size and count.
+// Block sizes and counts are positive. Two negative ones would make a side that looks positive.
+bool BlockFactorsPositive();
+
+// BlockFactorsPositive, and both image sides lie in 1..4096, without a wrap of the product of size
+// and count.
 bool ImageGeometryUsable();
 
 // The image may be 0 x 0: SetNaviParam has not been called yet.

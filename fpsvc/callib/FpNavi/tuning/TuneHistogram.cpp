@@ -1,52 +1,15 @@
 #include "tuning/TuneHistogram.h"
 
-#include <algorithm>
-#include <iterator>
 #include <utility>
 
+#include "FpNavi.h"
 #include "base/NaviLog.h"
 #include "base/NaviMath.h"
-#include "param/NaviParam.h"
 
 namespace fpnavi {
-
-uint32_t _NAVI_img_histogram[256];
-uint32_t _NAVI_mean = 3;
-uint32_t _NAVI_top_mean = 3;
-uint32_t _NAVI_G20C = 0;
-uint32_t _NAVI_K_value = 0;
-
 namespace {
 
 constexpr int32_t kCornerNum = 4;
-constexpr uint32_t kGainFieldMax = 7;  // the amplifiers have eight steps
-
-// Amplification at each step: tenths for the first pair of stages, units for the others.
-constexpr int32_t _NAVI_gain_ratio_21[] = {10, 20, 40, 56, 70, 80, 112, 140};
-constexpr int32_t _NAVI_gain_ratio_43[] = {1, 2, 3, 4, 5, 6, 7, 8};
-
-// The fields of a packed gain code that enter the gain factor.
-struct GainFields {
-    uint32_t first;   // bits 12 to 15, a step of _NAVI_gain_ratio_21
-    uint32_t second;  // bits 4 to 7, a step of _NAVI_gain_ratio_43
-    uint32_t third;   // bits 0 to 3, likewise
-};
-
-GainFields SplitGainCode(uint32_t code) {
-    return {code >> 12 & 0xFU, code >> 4 & 0xFU, code & 0xFU};
-}
-
-bool FieldsUsable(const GainFields& fields) {
-    return fields.first <= kGainFieldMax && fields.second <= kGainFieldMax &&
-           fields.third <= kGainFieldMax;
-}
-
-// factor times the ratios of the fields, wrapping.
-int32_t Amplify(int32_t factor, const GainFields& fields) {
-    return WrapMul(WrapMul(WrapMul(factor, _NAVI_gain_ratio_21[fields.first]),
-                           _NAVI_gain_ratio_43[fields.third]),
-                   _NAVI_gain_ratio_43[fields.second]);
-}
 
 // The corner blocks, a quarter of each side: top left, top right, bottom left, bottom right.
 void CutCorners(int32_t height, int32_t width, _NAVI_BlkNode (&Blk_Nodes)[kCornerNum]) {
@@ -89,16 +52,15 @@ bool ImageDividable(int32_t height, int32_t width) {
     return WrapMul(width, height) % 16 == 0;
 }
 
-int32_t _NAVI_ImgHistogram(const uint8_t* img, int32_t height, int32_t width) {
+std::optional<CornerGreys> MeasureCorner(const uint8_t* img, int32_t height, int32_t width,
+                                         int32_t rank) {
+    if (!ImageDividable(height, width)) {
+        NAVI_LOG("_NAVI_ImgHistogram", 1590, "error! size cannot be divided by 16!\n");
+        return std::nullopt;
+    }
     int32_t blk_mean[kCornerNum] = {0, 0, 0, 0};
     int32_t blk_origin_order[kCornerNum] = {0, 1, 2, 3};
     const int32_t blk_length = WrapMul(width, height) / 16;
-    _NAVI_mean = 0;
-    if (!ImageDividable(height, width)) {
-        NAVI_LOG("_NAVI_ImgHistogram", 1590, "error! size cannot be divided by 16!\n");
-        return -1;
-    }
-    std::fill(std::begin(_NAVI_img_histogram), std::end(_NAVI_img_histogram), 0U);
     _NAVI_BlkNode Blk_Nodes[kCornerNum];
     CutCorners(height, width, Blk_Nodes);
     for (int32_t b = 0; b < kCornerNum; ++b) {
@@ -107,10 +69,10 @@ int32_t _NAVI_ImgHistogram(const uint8_t* img, int32_t height, int32_t width) {
         blk_mean[b] = static_cast<int32_t>(sum / blk_length);
     }
     _NAVI_SortIndex(blk_mean, blk_origin_order, kCornerNum);
-    _NAVI_mean = static_cast<uint32_t>(blk_mean[_NAVI_blk_selection_mode]);
-    ForEachPixel(img, width, Blk_Nodes[blk_origin_order[_NAVI_blk_selection_mode]],
-                 [](uint8_t grey) { ++_NAVI_img_histogram[grey]; });
-    return 0;
+    CornerGreys corner = {blk_mean[rank], {}};
+    ForEachPixel(img, width, Blk_Nodes[blk_origin_order[rank]],
+                 [&corner](uint8_t grey) { ++corner.histogram[grey]; });
+    return corner;
 }
 
 void _NAVI_SortIndex(int32_t* fValue, int32_t* iIndex, int32_t len) {
@@ -139,23 +101,6 @@ int32_t _NAVI_CalcTop(uint32_t X, uint32_t Y, const uint32_t* histogram) {
     const int32_t i_top_X = SumBrightest(histogram, i_threshold_X);
     const int32_t i_top_Y = SumBrightest(histogram, i_threshold_Y);
     return WrapDiv(WrapSub(i_top_Y, i_top_X), WrapSub(i_threshold_Y, i_threshold_X));
-}
-
-uint32_t PackGainCode(uint32_t gain20, uint32_t gain2C) {
-    return (gain2C & 0xFU) | (gain2C >> 8 & 0xFU) << 4 | (gain20 >> 8 & 0xFU) << 8 |
-           (gain20 >> 16 & 0xFU) << 12;
-}
-
-bool GainCodesUsable(uint32_t g) {
-    return FieldsUsable(SplitGainCode(g)) &&
-           FieldsUsable(SplitGainCode(static_cast<uint32_t>(_NAVI_GAIN_REF)));
-}
-
-int32_t _NAVI_K_CALC(uint32_t g) {
-    const int32_t input_k_g_r = Amplify(_NAVI_INPUT_K, SplitGainCode(g));
-    const int32_t reference =
-        Amplify(1, SplitGainCode(static_cast<uint32_t>(_NAVI_GAIN_REF)));  // 10..8960
-    return input_k_g_r / reference;
 }
 
 }  // namespace fpnavi

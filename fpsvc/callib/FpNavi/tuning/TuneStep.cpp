@@ -3,92 +3,102 @@
 #include <algorithm>
 
 #include "base/NaviMath.h"
-#include "param/NaviParam.h"
-#include "tuning/TuneHistogram.h"
+#include "tuning/TuneRegisters.h"
 
 namespace fpnavi {
-
-int32_t _NAVI_flag_effective = 3;
-int32_t _NAVI_flag_recommend = 3;
-int32_t _NAVI_flag_recommend_pre = 3;
-int32_t _NAVI_flag_non_linear = 0;
-uint32_t _NAVI_dc_current = 3;
-uint32_t _NAVI_delta_dc_val_top = 0;
-uint32_t _NAVI_delta_dc_val_mean = 0;
-uint32_t _NAVI_delta_dc_val = 0;
-int32_t _NAVI_delta_dc_orient = 0;
-uint32_t _NAVI_NoMoreProcess = 0;
-
 namespace {
 
 constexpr int32_t kGreyTarget = 180;     // the middle of the recommended bands
 constexpr uint32_t kStepSaturated = 16;  // least step while greys are saturated and tell nothing
+constexpr int32_t kUnknown = 3;          // no recommendation yet
+constexpr uint32_t kByteMask = 0xFF;
 
-// Sets step to what brings grey to the target, at least 1; at the target it stays as it was. A gain
+// The step that brings grey to the target, at least 1; at the target it stays what it was. A gain
 // factor of 0 tells nothing about the size: 1.
-void UpdateStep(int32_t grey, uint32_t* step) {
+uint32_t StepToTarget(int32_t grey, uint32_t gainFactor, uint32_t before) {
     if (grey == kGreyTarget)
-        return;
+        return before;
     const int32_t distance =
         grey < kGreyTarget ? WrapSub(kGreyTarget, grey) : WrapSub(grey, kGreyTarget);
     const uint32_t enlarged = static_cast<uint32_t>(WrapMul(_NAVI_ENLARGE_K, distance));
-    *step = _NAVI_K_value == 0 ? 1U : std::max(enlarged / _NAVI_K_value, 1U);
+    return gainFactor == 0 ? 1U : std::max(enlarged / gainFactor, 1U);
 }
 
-void _NAVI_UpdateDC() {
-    UpdateStep(static_cast<int32_t>(_NAVI_top_mean), &_NAVI_delta_dc_val_top);
+uint32_t Raised(const DcState& dc) {
+    return std::min(WrapAddU(dc.current, dc.step), kDcMax);
 }
 
-void _NAVI_UpdateDC_mean() {
-    UpdateStep(static_cast<int32_t>(_NAVI_mean), &_NAVI_delta_dc_val_mean);
+uint32_t Lowered(const DcState& dc, int32_t reference) {
+    const int32_t reachable = WrapAdd(reference, static_cast<int32_t>(dc.step));
+    return static_cast<int32_t>(dc.current) > reachable ? WrapSubU(dc.current, dc.step)
+                                                        : static_cast<uint32_t>(reference);
 }
 
-// The DC cannot go further in the wanted direction.
-void StopAtLimit() {
-    _NAVI_flag_recommend_pre = 3;
-    _NAVI_NoMoreProcess = 0;
+// A saturated frame whose recommendation flipped since the last call: the last step overshot.
+bool Overshot(const DcState& dc, const GreyReading& reading) {
+    const bool known = dc.recommendPre != kUnknown && dc.recommendPre != 0;
+    const bool dcMoved = (dc.current & kByteMask) != (dc.pre & kByteMask);
+    const bool flipped = dc.recommendPre != reading.recommend;
+    return known && reading.nonLinear != 0 && dcMoved && flipped;
 }
 
-uint32_t Raised() {
-    return std::min(WrapAddU(_NAVI_dc_current, _NAVI_delta_dc_val), kDcMax);
-}
-
-uint32_t Lowered() {
-    const int32_t reachable = WrapAdd(_NAVI_DC_REF, static_cast<int32_t>(_NAVI_delta_dc_val));
-    return static_cast<int32_t>(_NAVI_dc_current) > reachable
-               ? WrapSubU(_NAVI_dc_current, _NAVI_delta_dc_val)
-               : static_cast<uint32_t>(_NAVI_DC_REF);
+// The mean of the DC and the one before; next to each other, the one before.
+uint32_t Bisected(const DcState& dc) {
+    const uint32_t d = WrapSubU(dc.current & kByteMask, dc.pre & kByteMask);
+    if (d == 1 || d == WrapSubU(0, 1))
+        return dc.pre;
+    return WrapAddU(dc.pre, dc.current) >> 1;
 }
 
 }  // namespace
 
-void _NAVI_GetDelta() {
-    _NAVI_UpdateDC();
-    _NAVI_UpdateDC_mean();
-    if (_NAVI_flag_recommend == 0) {
-        _NAVI_delta_dc_orient = 0;
-        _NAVI_delta_dc_val = 0;
-    } else if (_NAVI_flag_recommend == 1 || _NAVI_flag_recommend == -1) {
-        _NAVI_delta_dc_orient = -_NAVI_flag_recommend;
-        _NAVI_delta_dc_val = _NAVI_delta_dc_val_mean;
+DcState SizeStep(const DcState& before, const GreyReading& reading) {
+    DcState after = before;
+    after.stepTop =
+        StepToTarget(static_cast<int32_t>(reading.top), reading.gainFactor, before.stepTop);
+    after.stepMean =
+        StepToTarget(static_cast<int32_t>(reading.mean), reading.gainFactor, before.stepMean);
+    if (reading.recommend == 0) {
+        after.orient = 0;
+        after.step = 0;
+    } else if (reading.recommend == 1 || reading.recommend == -1) {
+        after.orient = -reading.recommend;
+        after.step = after.stepMean;
     }
-    if (_NAVI_flag_non_linear != 0)
-        _NAVI_delta_dc_val = std::max(_NAVI_delta_dc_val, kStepSaturated);
+    if (reading.nonLinear != 0)
+        after.step = std::max(after.step, kStepSaturated);
+    return after;
 }
 
-void _NAVI_Change0C() {
-    if (_NAVI_delta_dc_orient != 1 && _NAVI_delta_dc_orient != -1) {
-        _NAVI_NoMoreProcess = 0;
-        return;
+DcState ApplyStep(const DcState& before, int32_t effective, int32_t reference) {
+    DcState after = before;
+    after.noMoreProcess = 0;
+    if (before.orient != 1 && before.orient != -1)
+        return after;
+    const bool raise = before.orient == 1;
+    const uint32_t limit = raise ? kDcMax : static_cast<uint32_t>(reference);
+    if (before.current == limit) {  // the DC cannot go further in the wanted direction
+        after.recommendPre = kUnknown;
+        return after;
     }
-    const bool raise = _NAVI_delta_dc_orient == 1;
-    const uint32_t limit = raise ? kDcMax : static_cast<uint32_t>(_NAVI_DC_REF);
-    if (_NAVI_dc_current == limit) {
-        StopAtLimit();
-        return;
+    after.current = raise ? Raised(before) : Lowered(before, reference);
+    after.noMoreProcess = effective == 0 ? 1 : 2;
+    return after;
+}
+
+DcState DecideStep(const DcState& before, const GreyReading& reading, int32_t reference) {
+    DcState after = before;
+    if (reading.effective == 0) {
+        after.noMoreProcess = 0;
+        after.orient = 0;
+        after.step = 0;
+        return after;
     }
-    _NAVI_dc_current = raise ? Raised() : Lowered();
-    _NAVI_NoMoreProcess = _NAVI_flag_effective == 0 ? 1 : 2;
+    if (Overshot(before, reading)) {
+        after.current = Bisected(before);
+        return after;
+    }
+    return ApplyStep(SizeStep(before, reading), reading.effective, reference);
 }
 
 }  // namespace fpnavi

@@ -1,34 +1,37 @@
-// Tuning, the step: in which direction and how far the DC goes, within its limits. Owns the values
-// below; Tune writes them too, it classifies, resets and bisects.
+// Tuning, the decision: in which direction and how far the DC goes, within its limits. Owns nothing
+// and reads no state: each function makes the state after of the state before and a reading.
 #ifndef FPNAVI_TUNESTEP_H
 #define FPNAVI_TUNESTEP_H
 
 #include <cstdint>
 
+#include "tuning/TuneMeasure.h"
+
 namespace fpnavi {
 
-inline constexpr uint32_t kDcMax = 255;  // the DC field has 8 bits
+// What one call decides of the DC, and the next goes on from.
+struct DcState {
+    uint32_t current;        // the DC that is being tuned
+    uint32_t pre;            // DC that was in the sensor at the last call
+    int32_t recommendPre;    // the reading's recommend of the call before; 3 without one
+    uint32_t stepTop;        // step that would bring the top grey to 180; kept only
+    uint32_t stepMean;       // step that would bring the mean to 180
+    uint32_t step;           // step to apply
+    int32_t orient;          // 1 raise, -1 lower, 0 neither
+    uint32_t noMoreProcess;  // 0 no further step needed, 1 stepped though the mean is effective,
+                             // 2 stepped, look again
+};
 
-// Flags: -1 below a band, 0 inside, 1 above, 3 not computed yet.
-extern int32_t _NAVI_flag_effective;      // _NAVI_mean against _NAVI_range_mean
-extern int32_t _NAVI_flag_recommend;      // _NAVI_mean against _NAVI_range_mean_recommend
-extern int32_t _NAVI_flag_recommend_pre;  // the same of the call before; 3 without one
-extern int32_t _NAVI_flag_non_linear;     // 1: mean and top both lie outside 10..250
+// Direction and size of the next step.
+DcState SizeStep(const DcState& before, const GreyReading& reading);
 
-extern uint32_t _NAVI_dc_current;         // the DC that is being tuned
-extern uint32_t _NAVI_delta_dc_val_top;   // step that would bring the top grey to 180; kept only
-extern uint32_t _NAVI_delta_dc_val_mean;  // step that would bring the mean to 180
-extern uint32_t _NAVI_delta_dc_val;       // step to apply
-extern int32_t _NAVI_delta_dc_orient;     // 1 raise, -1 lower, 0 neither
+// Applies the step to the DC, within reference..kDcMax. reference: least DC, _NAVI_DC_REF;
+// effective: of the reading.
+DcState ApplyStep(const DcState& before, int32_t effective, int32_t reference);
 
-// 0 no further step needed, 1 stepped though the mean is effective, 2 stepped, look again.
-extern uint32_t _NAVI_NoMoreProcess;
-
-// Sets direction and size of the next step from the measured greys.
-void _NAVI_GetDelta();
-
-// Applies the step to _NAVI_dc_current, within _NAVI_DC_REF..kDcMax.
-void _NAVI_Change0C();
+// The whole decision of a call: no step while the mean is effective; half of the way back after a
+// step that overshot; else SizeStep and ApplyStep. reference: least DC, _NAVI_DC_REF.
+DcState DecideStep(const DcState& before, const GreyReading& reading, int32_t reference);
 
 }  // namespace fpnavi
 

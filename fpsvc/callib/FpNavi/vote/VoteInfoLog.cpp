@@ -24,7 +24,7 @@ namespace {
 const char kFunction[] = "Voting_fp_mode";
 
 void LogCentroids(const NaviVoteInfo_t& info) {
-    const int32_t n = info.calc_cnt;
+    const int32_t n = PairCount(info);
     NAVI_LOG(kFunction, 512, "Initial and final centroid position are (%d, %d) and (%d, %d).\n",
              info.xc[0], info.yc[0], info.xc[n], info.yc[n]);
     NAVI_LOG(kFunction, 516, "Centroid method result array are:\n" TEN_FORMATS,
@@ -34,7 +34,7 @@ void LogCentroids(const NaviVoteInfo_t& info) {
 }
 
 void LogDoubleScan(const NaviVoteInfo_t& info) {
-    const int32_t n = info.calc_cnt;
+    const int32_t n = PairCount(info);
     NAVI_LOG(kFunction, 523,
              "Initial and final centroid position of hardware navigation are (%d, %d) and "
              "(%d, %d).\n",
@@ -57,7 +57,7 @@ void LogFingerprint(const NaviVoteInfo_t& info) {
 
 void LogVoteInfo() {
     NAVI_LOG(kFunction, 508, "##################### Vote information ########################\n");
-    NAVI_LOG(kFunction, 510, "calculate count = %d\n", s_voteInfo.calc_cnt);
+    NAVI_LOG(kFunction, 510, "calculate count = %d\n", PairCount(s_voteInfo));
     LogCentroids(s_voteInfo);
     LogDoubleScan(s_voteInfo);
     LogFingerprint(s_voteInfo);

@@ -97,7 +97,8 @@ bool ScorePair(int32_t i, bool fpTrusted, Tally* tally) {
 // Adds up all pairs; empty when a motionless pair was to be scored.
 std::optional<Tally> TallyPairs() {
     Tally tally = {};
-    for (int32_t i = 0; i < s_voteInfo.calc_cnt; ++i) {
+    const int32_t calc_cnt = PairCount(s_voteInfo);
+    for (int32_t i = 0; i < calc_cnt; ++i) {
         const bool fpTrusted = s_voteInfo.diff[i] <= s_diffThresholdStr;
         Accumulate(CtMove(i), &tally.sumCt);
         if (fpTrusted)
@@ -136,7 +137,7 @@ int32_t ChooseKey(const DirectionSums& fp, const DirectionSums& ct) {
 // What the distances alone decide: a key, or empty when the scores have to.
 std::optional<int32_t> JudgeDistances(const Tally& tally, int32_t ct_final_distance,
                                       int32_t fp_final_distance) {
-    const int32_t calc_cnt = s_voteInfo.calc_cnt;
+    const int32_t calc_cnt = PairCount(s_voteInfo);
     const bool anyRest = tally.count_of_diff_result != 0;
     const bool hardlyMoved =
         ct_final_distance < s_ct_none_threshold && ct_final_distance > 0 && fp_final_distance == 0;

@@ -18,9 +18,10 @@ struct VerdictCounts {
     }
 };
 
-VerdictCounts CountVerdicts() {
+// Of the first calc_cnt pairs.
+VerdictCounts CountVerdicts(int32_t calc_cnt) {
     VerdictCounts counts = {};
-    for (int32_t i = 0; i < s_voteInfo.calc_cnt; ++i) {
+    for (int32_t i = 0; i < calc_cnt; ++i) {
         const int32_t vkey = s_voteInfo.vkey_ct[i];
         if (vkey >= VKEY_NONE && vkey <= VKEY_NO_MOVE)
             ++counts.byKey[vkey];
@@ -69,14 +70,14 @@ int32_t VoteAlong(const Axis& axis, const VerdictCounts& counts) {
 }  // namespace
 
 int32_t Voting_hg_mode() {
-    const int32_t calc_cnt = s_voteInfo.calc_cnt;
+    const int32_t calc_cnt = PairCount(s_voteInfo);
     const Axis horizontal = {VKEY_RIGHT, VKEY_LEFT,        VKEY_DOWN,
                              VKEY_UP,    s_voteInfo.xc[0], s_voteInfo.xc[calc_cnt]};
     const Axis vertical = {VKEY_UP,    VKEY_DOWN,        VKEY_LEFT,
                            VKEY_RIGHT, s_voteInfo.yc[0], s_voteInfo.yc[calc_cnt]};
     s_voteInfo.dx_sum = WrapSub(horizontal.last, horizontal.first);
     s_voteInfo.dy_sum = WrapSub(vertical.last, vertical.first);
-    const VerdictCounts counts = CountVerdicts();
+    const VerdictCounts counts = CountVerdicts(calc_cnt);
     if (counts.Moving() == 0)
         return VKEY_NO_MOVE;
     const int32_t ax = WrapAbs(s_voteInfo.dx_sum);
