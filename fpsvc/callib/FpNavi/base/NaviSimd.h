@@ -68,6 +68,17 @@ inline int32_t Total(Sums sums) {
     return _mm_cvtsi128_si32(_mm_add_epi32(sums, _mm_srli_si128(sums, 8)));
 }
 
+// The sum of sixteen counts; below 2^31.
+inline int32_t SumCounts16(const int32_t* p) {
+    const auto four = [p](int32_t i) {
+        return _mm_loadu_si128(reinterpret_cast<const __m128i*>(p + i));
+    };
+    const __m128i sums =
+        _mm_add_epi32(_mm_add_epi32(four(0), four(4)), _mm_add_epi32(four(8), four(12)));
+    const __m128i pairs = _mm_add_epi32(sums, _mm_srli_si128(sums, 8));
+    return _mm_cvtsi128_si32(_mm_add_epi32(pairs, _mm_srli_si128(pairs, 4)));
+}
+
 #elif defined(__ARM_NEON) && !defined(FPNAVI_PLAIN_LANES)
 
 using Bytes16 = uint8x16_t;
@@ -117,6 +128,13 @@ inline Sums AddDiffs(Sums sums, Bytes16 a, Bytes16 b) {
 inline int32_t Total(Sums sums) {
     const uint64x2_t halves = vpaddlq_u32(sums);
     return static_cast<int32_t>(vgetq_lane_u64(halves, 0) + vgetq_lane_u64(halves, 1));
+}
+
+inline int32_t SumCounts16(const int32_t* p) {
+    const int32x4_t sums = vaddq_s32(vaddq_s32(vld1q_s32(p), vld1q_s32(p + 4)),
+                                     vaddq_s32(vld1q_s32(p + 8), vld1q_s32(p + 12)));
+    const int64x2_t pairs = vpaddlq_s32(sums);
+    return static_cast<int32_t>(vgetq_lane_s64(pairs, 0) + vgetq_lane_s64(pairs, 1));
 }
 
 #else
@@ -184,6 +202,13 @@ inline Sums AddDiffs(Sums sums, const Bytes16& a, const Bytes16& b) {
 }
 inline int32_t Total(Sums sums) {
     return sums;
+}
+
+inline int32_t SumCounts16(const int32_t* p) {
+    int32_t sum = 0;
+    for (int32_t i = 0; i < kLanes; ++i)
+        sum += p[i];
+    return sum;
 }
 
 #endif
