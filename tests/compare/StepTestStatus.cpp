@@ -66,6 +66,30 @@ TEST(StepBlockMeasures, EverySizeReadsNothingBehindTheLastPixel) {
     }
 }
 
+// Sides beyond those of random frames; greys of both a flat and a random frame.
+TEST(StepBlockMeasures, LargeFramesGiveTheSame) {
+    SimRandom random = StepRandom(603, 0);
+    for (const FrameSize size : {FrameSize{127, 128}, FrameSize{300, 257}, FrameSize{640, 481}}) {
+        SetStepParams(size);
+        std::vector<uint8_t> greys(size.Pixels(), 250);
+        for (int32_t round = 0; round < 3; ++round) {
+            int32_t module[3] = {-9, -9, -9};
+            int32_t plain[3] = {-8, -8, -8};
+            fpnavi::GetBlkMeanMin(greys.data(), &module[0]);
+            fpnavi::GetBlkMeanDiff(greys.data(), &module[1]);
+            fpnavi::GetGreyRange(greys.data(), &module[2]);
+            reference::GetBlkMeanMin(greys.data(), &plain[0]);
+            reference::GetBlkMeanDiff(greys.data(), &plain[1]);
+            reference::GetGreyRange(greys.data(), &plain[2]);
+            for (size_t n = 0; n < 3; ++n)
+                ASSERT_EQ(module[n], plain[n])
+                    << size.width << " x " << size.height << ", measure " << n;
+            for (uint8_t& grey : greys)
+                grey = static_cast<uint8_t>(random.Below(round == 0 ? 256 : 40));
+        }
+    }
+}
+
 // The status of both sides, which is the same, as is the flag that it leaves.
 int32_t Status(const std::vector<uint8_t>& greys) {
     const int32_t module = ::vmk_fp_navigation_detect_finger_status(greys.data());

@@ -44,6 +44,16 @@ TEST_F(HgDetect, MeanIsTruncated) {
     EXPECT_EQ(Detect(frame), 1);
 }
 
+TEST_F(HgDetect, SumOfTheLargestWhiteFrameWraps) {
+    // 2^24 pixels of 255 sum up to 2^32 - 2^24: the low 32 bits are -2^24, and the mean is -1.
+    m_params.Set("s_imageWidthHg", 4096).Set("s_imageHeightHg", 4096);
+    TestFrame frame(4096, 4096, 255);
+    m_params.Set("s_highSensitiveMode", 0).Set("s_meanThreshold", -1);
+    EXPECT_EQ(Detect(frame), 1);
+    m_params.Set("s_meanThreshold", -2);
+    EXPECT_EQ(Detect(frame), 0);
+}
+
 TEST_F(HgDetect, OneDarkQuadrantIsAFingerInTheSensitiveModeOnly) {
     // Quadrants of 20 x 24; the whole mean is (180 + 3 * 255) / 4 = 236.
     for (const int32_t row : {0, 24}) {

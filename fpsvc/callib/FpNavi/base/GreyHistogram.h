@@ -3,10 +3,14 @@
 #define FPNAVI_GREYHISTOGRAM_H
 
 #include <cstdint>
+#include <cstring>
+
+#include "base/NaviSimd.h"
 
 namespace fpnavi {
 
 inline constexpr int32_t kGreyLevels = 256;
+inline constexpr int32_t kBlocksCounted = 4;
 
 // Counts bytes by value. Four histograms take turns: neighbours are often equal, and each would
 // wait for the store of the one before.
@@ -41,32 +45,59 @@ inline void CountBytes(const uint8_t* values, int32_t count, int32_t (&hist)[kGr
         hist[level] = counter.Of(level);
 }
 
-// Cumulative counts of a histogram are compared hundredfold, so that no division rounds: at most
-// 100 * 2^24 < 2^31 for the largest frame.
+// Counts the pixels of four blocks side by side by grey level: hist[b][grey] of block b. greys:
+// first pixel of the first block; each block has height rows of width pixels, stride apart. A pixel
+// of each block in turn: equal neighbours in one table would serialise on store-to-load forwarding.
+inline void CountFourBlocks(const uint8_t* greys, int32_t width, int32_t height, int32_t stride,
+                            int32_t (&hist)[kBlocksCounted][kGreyLevels]) {
+    std::memset(hist, 0, sizeof hist);
+    for (int32_t row = 0; row < height; ++row) {
+        const uint8_t* const pixels = greys + row * stride;
+        for (int32_t i = 0; i < width; ++i) {
+            ++hist[0][pixels[i]];
+            ++hist[1][pixels[width + i]];
+            ++hist[2][pixels[2 * width + i]];
+            ++hist[3][pixels[3 * width + i]];
+        }
+    }
+}
 
-// First level from 1 on at which start and the counts of hist from level 1 to it, hundredfold, sum
-// up to more than limit; kGreyLevels without one.
-inline int32_t FirstLevelAbove(const int32_t* hist, int32_t start, int32_t limit) {
-    int32_t upTo = start;
-    int32_t level = 1;
-    for (; level < kGreyLevels; ++level) {
-        upTo += 100 * hist[level];
-        if (upTo > limit)
-            break;
+// Levels at which the counts of a histogram exceed two limits.
+struct LevelPair {
+    int32_t low, high;
+};
+
+// Sixteen levels from first on, and the number of pixels below them without those of grey 0: below
+// the first group -hist[0], which level 0 brings back to 0.
+struct LevelGroup {
+    int32_t first, below;
+};
+
+// First level of the group up to which more than limit pixels lie, the one behind the group without
+// one. No branch: where it lies cannot be predicted.
+inline int32_t LevelAbove(const int32_t* hist, LevelGroup group, int32_t limit) {
+    int32_t level = group.first;
+    int32_t upTo = group.below;
+    for (int32_t i = 0; i < kLanes; ++i) {
+        upTo += hist[group.first + i];
+        level += upTo <= limit ? 1 : 0;
     }
     return level;
 }
 
-// The same, from the last level down: all is what start and the counts of all levels from 1 on sum
-// up to, hundredfold. For limits near it.
-inline int32_t FirstLevelAboveDownwards(const int32_t* hist, int32_t all, int32_t limit) {
-    if (all <= limit)
-        return kGreyLevels;
-    int32_t level = kGreyLevels - 1;
-    for (int32_t below = all - 100 * hist[level]; level > 1 && below > limit;
-         below -= 100 * hist[level])
-        --level;
-    return level;
+// For each limit the first level up to which more than limit pixels lie, those of grey 0 not
+// counted; kGreyLevels without one. Limits are not negative. It lies in the last group below which
+// at most limit pixels lie.
+inline LevelPair FirstLevelsAbove(const int32_t* hist, int32_t lowLimit, int32_t highLimit) {
+    LevelGroup group = {0, -hist[0]};
+    LevelGroup low = group;
+    LevelGroup high = group;
+    for (; group.first < kGreyLevels; group.first += kLanes) {
+        low = group.below <= lowLimit ? group : low;
+        high = group.below <= highLimit ? group : high;
+        group.below += SumCounts16(hist + group.first);
+    }
+    return {LevelAbove(hist, low, lowLimit), LevelAbove(hist, high, highLimit)};
 }
 
 }  // namespace fpnavi

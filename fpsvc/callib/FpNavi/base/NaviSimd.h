@@ -118,6 +118,17 @@ inline void StoreScaled(uint8_t* p, const Quads& a, uint32_t factor, int32_t shi
     std::memcpy(p, &bytes, sizeof bytes);
 }
 
+// The sum of sixteen counts; below 2^31.
+inline int32_t SumCounts16(const int32_t* p) {
+    const auto four = [p](int32_t i) {
+        return _mm_loadu_si128(reinterpret_cast<const __m128i*>(p + i));
+    };
+    const __m128i sums =
+        _mm_add_epi32(_mm_add_epi32(four(0), four(4)), _mm_add_epi32(four(8), four(12)));
+    const __m128i pairs = _mm_add_epi32(sums, _mm_srli_si128(sums, 8));
+    return _mm_cvtsi128_si32(_mm_add_epi32(pairs, _mm_srli_si128(pairs, 4)));
+}
+
 #elif defined(__ARM_NEON) && !defined(FPNAVI_PLAIN_LANES)
 
 using Bytes16 = uint8x16_t;
@@ -202,6 +213,13 @@ inline void StoreScaled(uint8_t* p, Quads a, uint32_t factor, int32_t shift) {
     const uint32_t bytes =
         vget_lane_u32(vreinterpret_u32_u8(vmovn_u16(vcombine_u16(words, words))), 0);
     std::memcpy(p, &bytes, sizeof bytes);
+}
+
+inline int32_t SumCounts16(const int32_t* p) {
+    const int32x4_t sums = vaddq_s32(vaddq_s32(vld1q_s32(p), vld1q_s32(p + 4)),
+                                     vaddq_s32(vld1q_s32(p + 8), vld1q_s32(p + 12)));
+    const int64x2_t pairs = vpaddlq_s32(sums);
+    return static_cast<int32_t>(vgetq_lane_s64(pairs, 0) + vgetq_lane_s64(pairs, 1));
 }
 
 #else
@@ -296,6 +314,13 @@ inline void StoreQuads(uint32_t* p, const Quads& a) {
 inline void StoreScaled(uint8_t* p, const Quads& a, uint32_t factor, int32_t shift) {
     for (int32_t i = 0; i < 4; ++i)
         p[i] = static_cast<uint8_t>(static_cast<uint32_t>(a.number[i]) * factor >> shift);
+}
+
+inline int32_t SumCounts16(const int32_t* p) {
+    int32_t sum = 0;
+    for (int32_t i = 0; i < kLanes; ++i)
+        sum += p[i];
+    return sum;
 }
 
 #endif

@@ -49,22 +49,19 @@ int32_t TakeOutBackground(const NaviFrame_t& img, int32_t (&hist)[kGreyLevels]) 
     return outside;
 }
 
-// hist: counts by grey level, cnt their sum. The cumulative count only grows: it crosses each limit
-// once at most, and not at all when it lies beyond from the start.
+// hist: counts by grey level, cnt their sum. The cumulative count crosses each limit, in hundredths
+// of a pixel, once at most, and not at all when level 0 lies beyond. A count above limit / 100,
+// truncated, is a hundredfold count above limit, so that no division rounds.
 GreySpan CutPercentiles(const int32_t (&hist)[kGreyLevels], int32_t cnt, int32_t cutOff) {
     const int32_t lo = WrapMul(cnt, cutOff);
     const int32_t hi = WrapMul(cnt, WrapSub(100, cutOff));
-    const int32_t start = 100 * hist[0];
-    GreySpan span = {0, 0};
-    if (start <= lo) {
-        const int32_t level = FirstLevelAbove(hist, start, lo);
-        span.min = level < kGreyLevels ? level - 1 : 0;
-    }
-    if (start < hi) {
-        const int32_t level = FirstLevelAboveDownwards(hist, 100 * cnt, hi - 1);
-        span.max = level < kGreyLevels ? level : 0;
-    }
-    return span;
+    const int32_t start = 100 * hist[0];  // at most 100 * 2^24 < 2^31
+    const bool crossesLow = start <= lo;
+    const bool crossesHigh = start < hi;
+    const LevelPair levels = FirstLevelsAbove(hist, crossesLow ? lo / 100 - hist[0] : 0,
+                                              crossesHigh ? (hi - 1) / 100 - hist[0] : 0);
+    return {crossesLow && levels.low < kGreyLevels ? levels.low - 1 : 0,
+            crossesHigh && levels.high < kGreyLevels ? levels.high : 0};
 }
 
 // The stretched grey is (grey - min) * scale / range, truncated and clamped; below min it is 0. The

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "FingerDetect.h"
+#include "base/ByteSums.h"
 #include "base/GreyHistogram.h"
 #include "base/NaviMath.h"
 #include "param/NaviParam.h"
@@ -15,33 +16,9 @@ constexpr int32_t rowNum = 4;
 constexpr int32_t blkNum = colNum * rowNum;
 constexpr int32_t kSpreadNone = -1;  // below every spread of block means
 
-// First pixel of block k of the frame at buffer, blocks counted row by row.
-const uint8_t* BlockAt(const uint8_t* buffer, int32_t k, int32_t blkWidth, int32_t blkHeight) {
-    return buffer + k / colNum * blkHeight * s_imageWidth + k % colNum * blkWidth;
-}
+static_assert(colNum == kBlocksCounted, "a row of blocks is counted at a time");
 
-int32_t BlockMean(const uint8_t* block, int32_t blkWidth, int32_t blkHeight) {
-    int32_t sum = 0;  // at most 255 * 1024 * 1024 < 2^31
-    for (int32_t row = 0; row < blkHeight; ++row) {
-        for (int32_t column = 0; column < blkWidth; ++column)
-            sum += block[row * s_imageWidth + column];
-    }
-    return sum / (blkWidth * blkHeight);
-}
-
-// Moves iLow and iHigh to where the cumulative counts of hist cross the limits (in hundredths of
-// a pixel). Grey 0 is never accumulated; a crossing that is not found leaves its level alone.
-void FindCrossings(const int32_t* hist, int32_t lowLimit, int32_t highLimit, int32_t* iLow,
-                   int32_t* iHigh) {
-    if (lowLimit >= 0) {
-        const int32_t level = FirstLevelAbove(hist, 0, lowLimit);
-        *iLow = level < kGreyLevels ? level - 1 : *iLow;
-    }
-    if (highLimit > 0) {
-        const int32_t level = FirstLevelAbove(hist, 0, highLimit - 1);
-        *iHigh = level < kGreyLevels ? level : *iHigh;
-    }
-}
+constexpr int32_t kNeverAbove = INT32_MAX;  // a limit that no count exceeds
 
 }  // namespace
 
@@ -54,8 +31,10 @@ int32_t GetBlkMeanDiff(const uint8_t* buffer, int32_t* blk_mean_diff) {
     int32_t max = 0;
     int32_t min = kGreyMax;
     for (int32_t k = 0; k < blkNum; ++k) {
-        const int32_t mean =
-            BlockMean(BlockAt(buffer, k, blkWidth, blkHeight), blkWidth, blkHeight);
+        const int32_t first = k / colNum * blkHeight * s_imageWidth + k % colNum * blkWidth;
+        // At most 1024 x 1024 pixels.
+        const int32_t sum = SumBlock(buffer, first, blkWidth, blkHeight, s_imageWidth);
+        const int32_t mean = sum / (blkWidth * blkHeight);
         max = std::max(max, mean);
         min = std::min(min, mean);
     }
@@ -69,21 +48,27 @@ int32_t GetGreyRange(const uint8_t* buffer, int32_t* range) {
     const int32_t blkWidth = s_imageWidth / colNum;
     const int32_t blkHeight = s_imageHeight / rowNum;
     const int32_t blkSize = blkWidth * blkHeight;
+    // In hundredths of a pixel. A hundredfold count is above the low limit when the count is above
+    // lowLimit / 100, and at least the high limit when it is above (highLimit - 1) / 100.
     const int32_t lowLimit = WrapMul(blkSize, s_cutOffPercent);
     const int32_t highLimit = WrapMul(blkSize, WrapSub(100, s_cutOffPercent));
+    // Even the count 0 is beyond such a limit, so nothing crosses it.
+    const int32_t lowCount = lowLimit >= 0 ? lowLimit / 100 : kNeverAbove;
+    const int32_t highCount = highLimit > 0 ? (highLimit - 1) / 100 : kNeverAbove;
     // Not reset for each block: one without a crossing is measured by the levels before it.
     int32_t iLow = 0;
     int32_t iHigh = 0;
     int32_t max = 0;
-    for (int32_t k = 0; k < blkNum; ++k) {
-        const uint8_t* const block = BlockAt(buffer, k, blkWidth, blkHeight);
-        int32_t hist[kGreyLevels] = {};
-        for (int32_t row = 0; row < blkHeight; ++row) {
-            for (int32_t column = 0; column < blkWidth; ++column)
-                ++hist[block[row * s_imageWidth + column]];
+    for (int32_t blkRow = 0; blkRow < rowNum; ++blkRow) {
+        int32_t hist[colNum][kGreyLevels];
+        CountFourBlocks(buffer + blkRow * blkHeight * s_imageWidth, blkWidth, blkHeight,
+                        s_imageWidth, hist);
+        for (const auto& histOfBlock : hist) {
+            const LevelPair levels = FirstLevelsAbove(histOfBlock, lowCount, highCount);
+            iLow = levels.low < kGreyLevels ? levels.low - 1 : iLow;
+            iHigh = levels.high < kGreyLevels ? levels.high : iHigh;
+            max = std::max(max, iHigh - iLow);
         }
-        FindCrossings(hist, lowLimit, highLimit, &iLow, &iHigh);
-        max = std::max(max, iHigh - iLow);
     }
     *range = max;
     return 0;
@@ -96,19 +81,19 @@ int32_t NavFingerDetectFp(const uint8_t* p_data) {
     // A block that the texture test leaves unwritten has no texture and a white mean.
     int32_t fftRes[2 * blockNum] = {0, 0, 0, 0, 0, 255, 255, 255, 255, 255};
     FingerBLKTest(p_data, s_imageWidth, s_imageHeight, fftRes, 0);
-    int32_t pressedBlkNum = 0;
+    // Each sign is a finger by itself, and the measures have no effect but their values: the
+    // dearer ones are taken only when the others decide nothing.
     for (int32_t i = 0; i < blockNum; ++i) {
         if (fftRes[i] >= s_fftResThreshold || fftRes[blockNum + i] < s_meanThresholdFp)
-            ++pressedBlkNum;
+            return 1;
     }
     int32_t blkMeanDiff = 0;
-    int32_t greyRange = 0;
     GetBlkMeanDiff(p_data, &blkMeanDiff);
+    if (blkMeanDiff >= s_blkMeanDiffThreshold)
+        return 1;
+    int32_t greyRange = 0;
     GetGreyRange(p_data, &greyRange);
-    return pressedBlkNum > 0 || blkMeanDiff >= s_blkMeanDiffThreshold ||
-                   greyRange >= s_rangeThreshold
-               ? 1
-               : 0;
+    return greyRange >= s_rangeThreshold ? 1 : 0;
 }
 
 }  // namespace fpnavi

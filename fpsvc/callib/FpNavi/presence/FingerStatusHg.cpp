@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "base/ByteSums.h"
 #include "base/NaviMath.h"
 #include "param/NaviParam.h"
 
@@ -9,6 +10,18 @@ namespace fpnavi {
 namespace {
 
 constexpr int32_t kMeanNone = 256;  // above every mean of grey levels
+
+// Sum of the first count bytes of the frame; low 32 bits, as the mean divides no more.
+int32_t FrameSum(const uint8_t* p_data, int32_t count) {
+    int64_t sum = 0;
+    while (count > 0) {
+        const int32_t part = std::min(count, kMostSummed);
+        sum += SumBlock(p_data, 0, part, 1, part);
+        p_data += part;
+        count -= part;
+    }
+    return Wrap(sum);
+}
 
 }  // namespace
 
@@ -22,13 +35,9 @@ int32_t GetBlkMeanMin(const uint8_t* p_data, int32_t* blk_mean_min) {
     if (blkHeight < 1 || blkWidth < 1)
         return 0;
     for (int32_t k = 0; k < blkNum; ++k) {
-        const uint8_t* const block =
-            p_data + k / colNum * blkHeight * s_imageWidth + k % colNum * blkWidth;
-        int32_t sum = 0;  // at most 255 * 2048 * 2048 < 2^31
-        for (int32_t row = 0; row < blkHeight; ++row) {
-            for (int32_t column = 0; column < blkWidth; ++column)
-                sum += block[row * s_imageWidth + column];
-        }
+        const int32_t first = k / colNum * blkHeight * s_imageWidth + k % colNum * blkWidth;
+        // At most 2048 x 2048 = 2^22 pixels.
+        const int32_t sum = SumBlock(p_data, first, blkWidth, blkHeight, s_imageWidth);
         *blk_mean_min = std::min(*blk_mean_min, sum / (blkWidth * blkHeight));
     }
     return 0;
@@ -38,10 +47,7 @@ int32_t NavFingerDetectHg(const uint8_t* p_data) {
     const int32_t imgSize = WrapMul(s_imageWidthHg, s_imageHeightHg);
     if (imgSize < 1)
         return -1;
-    int64_t sum = 0;
-    for (int32_t p = 0; p < imgSize; ++p)
-        sum += p_data[p];
-    const int32_t mean = Wrap(sum) / imgSize;
+    const int32_t mean = FrameSum(p_data, imgSize) / imgSize;
     if (mean <= s_meanThreshold)
         return 1;
     if (s_highSensitiveMode != 1)

@@ -1,0 +1,92 @@
+// Counting four blocks by grey level, and the levels at which counts exceed their limits.
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cstdint>
+#include <memory>
+#include <random>
+
+#include "base/GreyHistogram.h"
+
+namespace {
+
+using namespace fpnavi;
+
+using Histogram = std::array<int32_t, kGreyLevels>;
+
+TEST(CountFourBlocks, EachBlockHasItsOwnTable) {
+    std::mt19937 random(31);
+    for (int32_t width = 0; width <= 9; ++width) {
+        for (int32_t height = 0; height <= 4; ++height) {
+            const int32_t stride = 4 * width + height;  // up to four columns more than the blocks
+            const size_t size = static_cast<size_t>(stride * height);
+            const std::unique_ptr<uint8_t[]> greys(new uint8_t[size]);
+            Histogram expected[kBlocksCounted] = {};
+            for (size_t p = 0; p < size; ++p) {
+                greys[p] = static_cast<uint8_t>(random() & 255U);
+                const size_t column = p % static_cast<size_t>(stride);
+                if (column < static_cast<size_t>(4 * width))
+                    ++expected[column / static_cast<size_t>(width)][greys[p]];
+            }
+            int32_t hist[kBlocksCounted][kGreyLevels];
+            CountFourBlocks(greys.get(), width, height, stride, hist);
+            for (size_t block = 0; block < kBlocksCounted; ++block) {
+                for (size_t level = 0; level < kGreyLevels; ++level)
+                    ASSERT_EQ(hist[block][level], expected[block][level])
+                        << width << " x " << height << ", block " << block << ", grey " << level;
+            }
+        }
+    }
+}
+
+int32_t PlainLevelAbove(const Histogram& hist, int32_t limit) {
+    int32_t upTo = 0;
+    for (int32_t level = 1; level < kGreyLevels; ++level) {
+        upTo += hist[static_cast<size_t>(level)];
+        if (upTo > limit)
+            return level;
+    }
+    return kGreyLevels;
+}
+
+void ExpectPlainLevels(const Histogram& hist, int32_t low, int32_t high) {
+    const LevelPair levels = FirstLevelsAbove(hist.data(), low, high);
+    EXPECT_EQ(levels.low, PlainLevelAbove(hist, low)) << "low limit " << low;
+    EXPECT_EQ(levels.high, PlainLevelAbove(hist, high)) << "high limit " << high;
+}
+
+TEST(FirstLevelsAbove, OneLevelWithPixelsIsFoundWhereverItLies) {
+    for (size_t level = 1; level < kGreyLevels; ++level) {
+        Histogram hist{};
+        hist[level] = 5;
+        const LevelPair levels = FirstLevelsAbove(hist.data(), 4, 5);
+        EXPECT_EQ(levels.low, static_cast<int32_t>(level));
+        EXPECT_EQ(levels.high, kGreyLevels) << "never more than five";
+    }
+}
+
+TEST(FirstLevelsAbove, PixelsOfGreyZeroDoNotCount) {
+    Histogram hist{};
+    hist[0] = 1 << 20;
+    EXPECT_EQ(FirstLevelsAbove(hist.data(), 0, INT32_MAX).low, kGreyLevels);
+    hist[1] = 1;
+    EXPECT_EQ(FirstLevelsAbove(hist.data(), 0, INT32_MAX).low, 1);
+    EXPECT_EQ(FirstLevelsAbove(hist.data(), 1, INT32_MAX).low, kGreyLevels);
+}
+
+TEST(FirstLevelsAbove, RandomCountsAndLimitsInEitherOrder) {
+    std::mt19937 random(32);
+    const auto below = [&random](uint32_t bound) {
+        return static_cast<int32_t>(static_cast<uint32_t>(random()) % bound);
+    };
+    for (int32_t round = 0; round < 3000; ++round) {
+        Histogram hist{};
+        const int32_t levels = 1 + below(round % 2 == 0 ? 5 : 300);
+        for (int32_t i = 0; i < levels; ++i)
+            hist[static_cast<size_t>(below(kGreyLevels))] += below(9);
+        ExpectPlainLevels(hist, below(20), below(1500));
+        ExpectPlainLevels(hist, below(1500), below(20));
+    }
+}
+
+}  // namespace
