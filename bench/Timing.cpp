@@ -28,11 +28,35 @@ double Median(std::vector<double> values) {
     return *middle;
 }
 
-double Times::MedianMicroseconds() const {
+std::vector<double> Times::MedianOfPairs() const {
     std::vector<double> medians;
     for (const std::vector<double>& times : m_ofPair)
         medians.push_back(Median(times));
-    return Median(std::move(medians)) / 1000;
+    return medians;
+}
+
+double Times::MedianMicroseconds() const {
+    return Median(MedianOfPairs()) / 1000;
+}
+
+double Times::MedianPerUnit(const std::vector<double>& units) const {
+    std::vector<double> values = MedianOfPairs();
+    for (size_t i = 0; i < values.size(); ++i)
+        values[i] /= units[i];
+    return Median(std::move(values));
+}
+
+double TakeTurns(const std::vector<TimedCall>& calls, size_t pairs, std::vector<Times>* times) {
+    double sum = 0;
+    for (size_t pair = 0; pair < pairs; ++pair) {
+        for (size_t turn = 0; turn < calls.size(); ++turn) {
+            const size_t call = (pair + turn) % calls.size();
+            const double time = calls[call](pair);
+            (*times)[call].Add(pair, time);
+            sum += call + 1 == calls.size() ? time : 0;
+        }
+    }
+    return sum / static_cast<double>(pairs);
 }
 
 }  // namespace bench

@@ -3,6 +3,7 @@
 #define BENCH_TIMING_H
 
 #include <chrono>
+#include <functional>
 #include <vector>
 
 namespace bench {
@@ -30,10 +31,22 @@ class Times {
     void Add(size_t pair, double nanoseconds) { m_ofPair[pair].push_back(nanoseconds); }
     // Microseconds: the median over the pairs of each pair's median.
     double MedianMicroseconds() const;
+    // Nanoseconds: the median over the pairs of each pair's median by its number of units, of
+    // which every pair has at least one.
+    double MedianPerUnit(const std::vector<double>& units) const;
 
   private:
+    std::vector<double> MedianOfPairs() const;
+
     std::vector<std::vector<double>> m_ofPair;
 };
+
+// Nanoseconds of a call on the pair of that number.
+using TimedCall = std::function<double(size_t)>;
+
+// One round: each call on every pair, pair by pair, the first of them a different one each time.
+// times has an entry for each call. Returns the mean nanoseconds of the last call.
+double TakeTurns(const std::vector<TimedCall>& calls, size_t pairs, std::vector<Times>* times);
 
 }  // namespace bench
 
