@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <functional>
+#include <optional>
 
 #include "ParamTable.h"
 #include "Reference.h"
@@ -85,14 +86,23 @@ PairSet Collect(PairKind kind, int32_t count, const host::ParamBlock& params,
     return set;
 }
 
+Shift TruthOf(const host::RecordedFrame& first, const host::RecordedFrame& second) {
+    const auto pixels = [](std::optional<int32_t> from, std::optional<int32_t> to) {
+        return static_cast<double>(to.value_or(0) - from.value_or(0)) / host::kSubPixels;
+    };
+    return {pixels(first.x16, second.x16), pixels(first.y16, second.y16)};
+}
+
 }  // namespace
 
 void AddPairsOf(const host::Gesture& gesture, PairKind kind, int32_t count, PairSet* set) {
     int32_t taken = 0;
     const size_t frames = gesture.frames.size();
     for (size_t n = 0; n + 1 < frames && taken < count; ++n) {
-        FramePair pair = {SortedFrame(gesture, gesture.frames[n]),
-                          SortedFrame(gesture, gesture.frames[n + 1])};
+        const host::RecordedFrame& first = gesture.frames[n];
+        const host::RecordedFrame& second = gesture.frames[n + 1];
+        FramePair pair = {SortedFrame(gesture, first), SortedFrame(gesture, second),
+                          TruthOf(first, second)};
         if (!Suits(kind, pair))
             continue;
         set->pairs.push_back(std::move(pair));

@@ -27,9 +27,16 @@ struct Frame {
     uint32_t reg28 = 0;
 };
 
+// Pixels from the first frame to the second, x to the right, y downwards.
+struct Shift {
+    double x = 0;
+    double y = 0;
+};
+
 struct FramePair {
     Frame first;
     Frame second;
+    Shift truth;  // of the finger; not kept in files
 };
 
 struct PairSet {

@@ -36,9 +36,12 @@ host::SimPlan FitPlan(host::SimPlan plan, const host::SensorWindow& window) {
     return plan;
 }
 
-host::RecordedFrame FrameOf(const std::vector<uint8_t>& greys, const host::Geometry& geometry) {
+host::RecordedFrame FrameOf(const std::vector<uint8_t>& greys, const host::Geometry& geometry,
+                            const host::FingerState& finger) {
     host::RecordedFrame frame;
     frame.raw = host::ToBlockOrder(greys, geometry);
+    frame.x16 = finger.x16;
+    frame.y16 = finger.y16;
     return frame;
 }
 
@@ -100,7 +103,7 @@ host::Gesture SimulateSized(const host::SimPlan& wanted, const host::ParamBlock&
         const std::vector<host::SkinPoint> points = host::SenseSkin(skin, patch, finger, window);
         const int32_t width = gesture.geometry.Width();
         gesture.frames.push_back(
-            FrameOf(host::MakeGreys(grey, points, width, 0, random), gesture.geometry));
+            FrameOf(host::MakeGreys(grey, points, width, 0, random), gesture.geometry, finger));
     }
     return gesture;
 }

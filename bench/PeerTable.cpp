@@ -1,4 +1,6 @@
 // The table of peers: each in turn with the module's moved pair, on simulated and recorded frames.
+#include <algorithm>
+#include <cmath>
 #include <cstdlib>
 
 #include "Peers.h"
@@ -15,6 +17,26 @@ const Step& ModulePair() {
     std::abort();  // the list has it
 }
 
+// The module's displacement, whose y counts upwards.
+Shift ModuleShift(const FramePair& pair) {
+    ModulePair().prepare(pair);
+    ModulePair().run(pair);
+    const NaviVoteInfo_t& record = *PrintNaviLog();
+    return {static_cast<double>(record.dx_fp[0]), static_cast<double>(-record.dy_fp[0])};
+}
+
+// Percent of the pairs in which shiftOf is at most a pixel off on either axis.
+double RightPercent(const PairSet& set, Shift (*shiftOf)(const FramePair& pair)) {
+    size_t right = 0;
+    for (const FramePair& pair : set.pairs) {
+        const Shift shift = shiftOf(pair);
+        const double off =
+            std::max(std::abs(shift.x - pair.truth.x), std::abs(shift.y - pair.truth.y));
+        right += off <= 1 ? 1 : 0;
+    }
+    return 100 * static_cast<double>(right) / static_cast<double>(set.pairs.size());
+}
+
 void ComparePeer(benchmark::State& state, const PairSet& set, const Peer& peer) {
     if (!BothAgree(state, PairKind::Moved, set))
         return;
@@ -26,6 +48,8 @@ void ComparePeer(benchmark::State& state, const PairSet& set, const Peer& peer) 
     state.counters[kPeer] = times[0].MedianMicroseconds();
     state.counters[kShipped] = times[1].MedianMicroseconds();
     state.counters[kRatio] = times[0].MedianMicroseconds() / times[1].MedianMicroseconds();
+    state.counters[kPeerRight] = RightPercent(set, peer.run);
+    state.counters[kShippedRight] = RightPercent(set, ModuleShift);
 }
 
 void AddPeersOn(const std::string& label, const PairSet& set, const Options& options) {
@@ -48,10 +72,13 @@ void AddPeers(const Options& options) {
 
 }  // namespace
 
-const Table kPeerTable = {
-    "--peers",
-    {{"moved pairs", "peer"},
-     {{"peer us", kPeer, "%.2f"}, {"shipped us", kShipped, "%.2f"}, {"ratio", kRatio, "%.2f"}}},
-    AddPeers};
+const Table kPeerTable = {"--peers",
+                          {{"moved pairs", "peer"},
+                           {{"peer us", kPeer, "%.2f"},
+                            {"shipped us", kShipped, "%.2f"},
+                            {"ratio", kRatio, "%.2f"},
+                            {"peer right", kPeerRight, "%.0f %%"},
+                            {"ours right", kShippedRight, "%.0f %%"}}},
+                          AddPeers};
 
 }  // namespace bench

@@ -9,12 +9,6 @@
 
 namespace bench {
 
-// Pixels from the first frame to the second, x to the right, y downwards.
-struct Shift {
-    double x;
-    double y;
-};
-
 struct Peer {
     const char* name;
     Shift (*run)(const FramePair& pair);

@@ -15,6 +15,8 @@ inline constexpr const char* kRatio = "ratio";          // plain by shipped, or 
 inline constexpr const char* kPerUnit = "ns_per_unit";  // of the shipped version
 inline constexpr const char* kTimesDefault = "times_default";
 inline constexpr const char* kPeer = "peer_us";
+inline constexpr const char* kPeerRight = "peer_right";        // percent of the pairs
+inline constexpr const char* kShippedRight = "shipped_right";  // percent of the pairs
 
 struct Column {
     const char* title;
