@@ -38,7 +38,7 @@ Shift SearchBlock(const uint8_t* cut, const uint8_t* p) {
     for (int32_t i = 0; i < kBlock / 2; ++i)
         block[i] = TwoRows(cut + 2 * i * kWidth);
     int32_t least = INT32_MAX;
-    int32_t best = 0;
+    Shift best;
     for (int32_t dy = -kReach; dy <= kReach; ++dy) {
         for (int32_t dx = -kReach; dx <= kReach; ++dx) {
             const uint8_t* const place = p + dy * kWidth + dx;
@@ -48,12 +48,11 @@ Shift SearchBlock(const uint8_t* cut, const uint8_t* p) {
             const int32_t sum = fpnavi::Total(sums);
             if (sum < least) {
                 least = sum;
-                best = (dy + kReach) * (2 * kReach + 1) + dx + kReach;
+                best = {static_cast<double>(dx), static_cast<double>(dy)};
             }
         }
     }
-    return {static_cast<double>(best % (2 * kReach + 1) - kReach),
-            static_cast<double>(best / (2 * kReach + 1) - kReach)};
+    return best;
 }
 
 double MiddleOf(double (&values)[kPerAxis * kPerAxis]) {

@@ -159,8 +159,8 @@ int Search(const Arguments& arguments) {
         same = SameRecordsFor(draw) && same;
         findings.push_back(Examine(draw));
         if (progress)
-            std::fprintf(stderr, "\r%llu of %llu", static_cast<unsigned long long>(n + 1),
-                         static_cast<unsigned long long>(arguments.draws));
+            std::fprintf(stderr, "\r%zu of %zu", findings.size(),
+                         static_cast<size_t>(arguments.draws));
     }
     if (progress)
         std::fputc('\n', stderr);

@@ -66,6 +66,7 @@ void CountUnits(benchmark::State& state, const Times& shipped, const std::vector
     if (comparison.unit == Unit::None)
         return;
     std::vector<double> units;
+    units.reserve(work.size());
     for (const PairWork& pair : work)
         units.push_back(std::max(pair.Of(comparison.unit), 1.0));
     const double perUnit = shipped.MedianPerUnit(units);

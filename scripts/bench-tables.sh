@@ -1,6 +1,7 @@
 # shellcheck shell=bash
 # Sourced by scripts/bench: its tables of times, from what the programs printed in each run to
 # $work/PRESET.TABLE.RUN.md.
+# shellcheck disable=SC2154 # root, work, runs, presets and names are those of scripts/bench
 
 # runs_of PRESET TABLE: the files of all runs, into the array files.
 runs_of() {
