@@ -40,8 +40,10 @@ FNR <= 2 {
     columns = NF - 1
     for (i = labels + 2; i <= columns; ++i) {
         cell = trimmed($i)
-        if (cell != "")
-            cells[key, i] = (key, i) in cells ? cells[key, i] "|" cell : cell
+        if (cell != "" && (key, i) in cells)
+            cells[key, i] = cells[key, i] "|" cell
+        else if (cell != "")
+            cells[key, i] = cell
     }
 }
 
