@@ -1,24 +1,43 @@
 #include "Timing.h"
 
+#include <time.h>
+
 #include <algorithm>
 
 namespace bench {
 namespace {
 
-double MeasureClock() {
+// The median of many times of nothing.
+template <class Reading>
+double CostOf(const Reading& reading) {
     std::vector<double> values;
     for (int i = 0; i < 10001; ++i) {
-        const auto start = std::chrono::steady_clock::now();
-        const auto end = std::chrono::steady_clock::now();
-        values.push_back(std::chrono::duration<double, std::nano>(end - start).count());
+        const double start = reading();
+        values.push_back(reading() - start);
     }
     return Median(std::move(values));
+}
+
+double SteadyTime() {
+    const auto now = std::chrono::steady_clock::now().time_since_epoch();
+    return std::chrono::duration<double, std::nano>(now).count();
 }
 
 }  // namespace
 
 double ClockCost() {
-    static const double cost = MeasureClock();
+    static const double cost = CostOf(SteadyTime);
+    return cost;
+}
+
+double ThreadTime() {
+    timespec now = {};
+    clock_gettime(CLOCK_THREAD_CPUTIME_ID, &now);
+    return static_cast<double>(now.tv_sec) * 1e9 + static_cast<double>(now.tv_nsec);
+}
+
+double ThreadTimeCost() {
+    static const double cost = CostOf(ThreadTime);
     return cost;
 }
 
@@ -37,6 +56,13 @@ std::vector<double> Times::MedianOfPairs() const {
 
 double Times::MedianMicroseconds() const {
     return Median(MedianOfPairs()) / 1000;
+}
+
+double Times::LeastMicroseconds() const {
+    double sum = 0;
+    for (const std::vector<double>& times : m_ofPair)
+        sum += *std::min_element(times.begin(), times.end());
+    return sum / static_cast<double>(m_ofPair.size()) / 1000;
 }
 
 double Times::MedianPerUnit(const std::vector<double>& units) const {
