@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "FramePairs.h"
+#include "PairWork.h"
 
 namespace bench {
 
@@ -19,6 +20,8 @@ struct Step {
 struct Comparison {
     const char* name;
     PairKind kind;
+    Unit unit;   // of the step's work
+    bool whole;  // a call of the library, not a step within one
     Step plain;
     Step shipped;
 };

@@ -3,6 +3,7 @@
 #define BENCH_TIMING_H
 
 #include <chrono>
+#include <functional>
 #include <vector>
 
 namespace bench {
@@ -19,6 +20,19 @@ double TimeOf(const F& f) {
     return std::chrono::duration<double, std::nano>(end - start).count() - ClockCost();
 }
 
+// Nanoseconds that this thread has run, and how many two readings with nothing between are apart.
+// Other programs do not count, but a reading takes ten times as long: for calls of microseconds.
+double ThreadTime();
+double ThreadTimeCost();
+
+// Nanoseconds of the thread in one call of f, without the reading's own.
+template <class F>
+double ThreadTimeOf(const F& f) {
+    const double start = ThreadTime();
+    f();
+    return ThreadTime() - start - ThreadTimeCost();
+}
+
 // The middle value; values is not empty.
 double Median(std::vector<double> values);
 
@@ -30,10 +44,25 @@ class Times {
     void Add(size_t pair, double nanoseconds) { m_ofPair[pair].push_back(nanoseconds); }
     // Microseconds: the median over the pairs of each pair's median.
     double MedianMicroseconds() const;
+    // Microseconds: the mean over the pairs of each pair's least, which other programs on the
+    // machine disturb least.
+    double LeastMicroseconds() const;
+    // Nanoseconds: the median over the pairs of each pair's median by its number of units, of
+    // which every pair has at least one.
+    double MedianPerUnit(const std::vector<double>& units) const;
 
   private:
+    std::vector<double> MedianOfPairs() const;
+
     std::vector<std::vector<double>> m_ofPair;
 };
+
+// Nanoseconds of a call on the pair of that number.
+using TimedCall = std::function<double(size_t)>;
+
+// One round: each call on every pair, pair by pair, the first of them a different one each time.
+// times has an entry for each call. Returns the mean nanoseconds of the last call.
+double TakeTurns(const std::vector<TimedCall>& calls, size_t pairs, std::vector<Times>* times);
 
 }  // namespace bench
 

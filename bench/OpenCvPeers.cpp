@@ -7,8 +7,8 @@
 namespace bench {
 namespace {
 
-constexpr int kWidth = 56;
-constexpr int kHeight = 36;
+constexpr int kWidth = kDefaultFp.width;
+constexpr int kHeight = kDefaultFp.height;
 const cv::Rect kCenter(8, 8, 40, 20);
 
 // The frame as a matrix over the same bytes; nobody writes to it.
@@ -17,24 +17,26 @@ cv::Mat MatrixOf(const Frame& frame) {
 }
 
 // The centre of the first frame searched in the whole second one.
-void MatchTemplate(const FramePair& pair) {
+Shift MatchTemplate(const FramePair& pair) {
     cv::Mat scores;
     cv::matchTemplate(MatrixOf(pair.second), MatrixOf(pair.first)(kCenter), scores, cv::TM_SQDIFF);
     cv::Point place;
     cv::minMaxLoc(scores, nullptr, nullptr, &place);
+    return {static_cast<double>(place.x - kCenter.x), static_cast<double>(place.y - kCenter.y)};
 }
 
-void PhaseCorrelate(const FramePair& pair) {
+Shift PhaseCorrelate(const FramePair& pair) {
     cv::Mat first;
     cv::Mat second;
     MatrixOf(pair.first).convertTo(first, CV_32F);
     MatrixOf(pair.second).convertTo(second, CV_32F);
-    cv::phaseCorrelate(first, second);
+    const cv::Point2d shift = cv::phaseCorrelate(first, second);
+    return {shift.x, shift.y};
 }
 
 }  // namespace
 
-std::vector<Peer> Peers() {
+std::vector<Peer> OpenCvPeers() {
     cv::setNumThreads(1);
     return {{"matchTemplate", MatchTemplate}, {"phaseCorrelate", PhaseCorrelate}};
 }
