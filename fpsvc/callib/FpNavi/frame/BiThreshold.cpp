@@ -1,5 +1,6 @@
 // CalcBiThr: the threshold between ridge and valley with the largest variance between the classes.
 #include <cstdint>
+#include <cstdlib>
 
 #include "base/GreyHistogram.h"
 #include "base/NaviMath.h"
@@ -18,12 +19,26 @@ uint32_t WrappedCount(int32_t count) {
 }
 
 // One class: pixels of consecutive grey levels. At most 255 levels of at most 255 pixels: the sum
-// stays below 255 * 255 * 255 < 2^24.
+// stays below 255 * 255 * 255 < 2^24, and so does (mean + 1) * count.
 struct GreyClass {
     uint32_t count;
     uint32_t sum;
+};
 
-    int32_t Mean() const { return count != 0 ? static_cast<int32_t>(sum / count) : 0; }
+// The truncated mean of a class that only grows brighter from one threshold to the next: both do.
+// It mostly rises by 1 or not at all, which takes no division.
+struct RisingMean {
+    uint32_t next = 1;  // the mean and 1
+
+    // The mean of members, 0 for an empty class.
+    int32_t Of(const GreyClass& members) {
+        if (members.count == 0)
+            return 0;
+        next += next * members.count <= members.sum ? 1 : 0;
+        if (next * members.count <= members.sum)
+            next = members.sum / members.count + 1;
+        return static_cast<int32_t>(next) - 1;
+    }
 };
 
 // The class's share of the variance between the classes, in wrapping 32-bit arithmetic.
@@ -42,32 +57,50 @@ GreyClass CountAll(const int32_t (&hist)[kGreyLevels]) {
     return all;
 }
 
+// The search for the threshold, from the lowest one up.
+class Split {
+  public:
+    Split(const GreyClass& all, int32_t mean) : m_all(all), m_mean(mean) {}
+
+    // Tries the threshold t, to which added pixels of level t - 1 come.
+    void Try(int32_t t, uint32_t added) {
+        m_lower.count += added;
+        m_lower.sum += static_cast<uint32_t>(t - 1) * added;
+        const GreyClass upper = {m_all.count - m_lower.count, m_all.sum - m_lower.sum};
+        const int32_t lowerMean = m_lowerMean.Of(m_lower);
+        const int32_t upperMean = m_upperMean.Of(upper);
+        const int32_t variance = WrapAdd(ClassVariance(upper.count, upperMean, m_mean),
+                                         ClassVariance(m_lower.count, lowerMean, m_mean));
+        if (variance <= m_max)
+            return;
+        m_max = variance;
+        m_best = {t, std::abs(lowerMean - upperMean)};
+    }
+
+    const BiThreshold& Best() const { return m_best; }
+
+  private:
+    const GreyClass m_all;
+    const int32_t m_mean;  // of all pixels, also of those that no class has
+    GreyClass m_lower = {0, 0};
+    RisingMean m_lowerMean;
+    RisingMean m_upperMean;
+    int32_t m_max = 0;
+    BiThreshold m_best = {0, 0};
+};
+
 }  // namespace
 
 BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int64_t sum, int32_t size) {
-    const int32_t mean = Wrap(sum) / size;
-    const GreyClass all = CountAll(hist);
-    GreyClass lower = {0, 0};
-    BiThreshold best = {0, 0};
-    int32_t max = 0;
-    for (int32_t t = 1; t <= kGreyLast; ++t) {
-        const uint32_t added = WrappedCount(hist[t - 1]);
+    Split split(CountAll(hist), Wrap(sum) / size);
+    split.Try(1, WrappedCount(hist[0]));
+    for (int32_t t = 2; t <= kGreyLast; ++t) {
         // An empty level changes neither class, so the threshold before it was as good.
-        if (added == 0 && t > 1)
-            continue;
-        lower.count += added;
-        lower.sum += static_cast<uint32_t>(t - 1) * added;
-        const GreyClass upper = {all.count - lower.count, all.sum - lower.sum};
-        const int32_t lowerMean = lower.Mean();
-        const int32_t upperMean = upper.Mean();
-        const int32_t variance = WrapAdd(ClassVariance(upper.count, upperMean, mean),
-                                         ClassVariance(lower.count, lowerMean, mean));
-        if (variance > max) {
-            max = variance;
-            best = {t, lowerMean > upperMean ? lowerMean - upperMean : upperMean - lowerMean};
-        }
+        const uint32_t added = WrappedCount(hist[t - 1]);
+        if (added != 0)
+            split.Try(t, added);
     }
-    return best;
+    return split.Best();
 }
 
 int32_t CalcBiThr(const NaviFrame_t* img, int32_t* thr, int32_t* scale) {

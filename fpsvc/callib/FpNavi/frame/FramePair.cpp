@@ -8,20 +8,12 @@
 namespace fpnavi {
 namespace {
 
-constexpr int32_t kPieceSteps = kWordPixels / kLanes;
+constexpr int32_t kPieceSteps = kWordPixels / kLanes;  // of a piece
 constexpr int32_t kRowsPerCheck = 4;  // the sum is compared with the limit after these
-
-// Up to 64 neighbouring columns of a pairing. The bytes of mask are 255 for the columns that meet;
-// steps of sixteen reach from the first of them to the last.
-struct Piece {
-    int32_t column;
-    int32_t steps;
-    Bytes16 mask[kPieceSteps];  // 0 beyond the last step
-};
 
 // Cuts the piece that starts at the first column of meeting from column on. Returns false when
 // there is none.
-bool CutPiece(const Meeting& meeting, int32_t column, Piece* piece) {
+bool CutPiece(const Meeting& meeting, int32_t column, ColumnPiece* piece) {
     int32_t s = 0;
     while (s < meeting.count && meeting.spans[s].last <= column)
         ++s;
@@ -43,12 +35,15 @@ bool CutPiece(const Meeting& meeting, int32_t column, Piece* piece) {
     return true;
 }
 
-// Calls visit(piece) for all columns of meeting, from left to right, until it returns false.
+// Calls visit(piece) for all pieces of columns, from left to right, until it returns false.
 template <typename Visit>
-void ForEachPiece(const Meeting& meeting, Visit visit) {
-    Piece piece;
-    for (int32_t column = 0; CutPiece(meeting, column, &piece);
-         column = piece.column + kWordPixels) {
+void ForEachPiece(const Columns& columns, Visit visit) {
+    const Meeting& meeting = columns.meeting;
+    int32_t end = columns.head.column + kWordPixels;
+    if (!visit(columns.head) || meeting.spans[meeting.count - 1].last <= end)
+        return;
+    ColumnPiece piece;
+    for (; CutPiece(meeting, end, &piece); end = piece.column + kWordPixels) {
         if (!visit(piece))
             return;
     }
@@ -67,7 +62,7 @@ PixelPairs PairsAt(const LaidFrame& first, const LaidFrame& second, const Pairin
                    int32_t row, int32_t column) {
     const int32_t at1 = row * first.width + column;
     const int32_t at2 =
-        (row + pairing.rows->offset) * second.width + column + pairing.columns->offset;
+        (row + pairing.rows->offset) * second.width + column + pairing.columns->meeting.offset;
     return {first.grey + at1, first.mask + at1, second.grey + at2, second.mask + at2};
 }
 
@@ -89,7 +84,7 @@ Sums AddRow(Sums sums, const PixelPairs& pairs, int32_t place, const Bytes16 (&m
 
 // Sum over rows of a piece, width apart; stops at limit.
 template <int32_t kSteps>
-int64_t SumRows(const PixelPairs& pairs, int32_t width, int32_t rows, const Piece& piece,
+int64_t SumRows(const PixelPairs& pairs, int32_t width, int32_t rows, const ColumnPiece& piece,
                 int64_t limit) {
     Bytes16 mask[kPieceSteps];
     for (int32_t step = 0; step < kPieceSteps; ++step)
@@ -108,7 +103,7 @@ int64_t SumRows(const PixelPairs& pairs, int32_t width, int32_t rows, const Piec
 
 // Pixels in rows of a piece, width apart, that are finger in both frames; at most 2^24.
 template <int32_t kSteps>
-int32_t CountRows(const PixelPairs& pairs, int32_t width, int32_t rows, const Piece& piece) {
+int32_t CountRows(const PixelPairs& pairs, int32_t width, int32_t rows, const ColumnPiece& piece) {
     const Bytes16 one = Splat16(1);
     Bytes16 mask[kPieceSteps];
     for (int32_t step = 0; step < kPieceSteps; ++step)
@@ -121,8 +116,8 @@ int32_t CountRows(const PixelPairs& pairs, int32_t width, int32_t rows, const Pi
     return Total(sums);
 }
 
-using SumRowsOf = int64_t (*)(const PixelPairs&, int32_t, int32_t, const Piece&, int64_t);
-using CountRowsOf = int32_t (*)(const PixelPairs&, int32_t, int32_t, const Piece&);
+using SumRowsOf = int64_t (*)(const PixelPairs&, int32_t, int32_t, const ColumnPiece&, int64_t);
+using CountRowsOf = int32_t (*)(const PixelPairs&, int32_t, int32_t, const ColumnPiece&);
 
 // For pieces of 1 to 4 steps.
 constexpr SumRowsOf kSumRows[kPieceSteps] = {SumRows<1>, SumRows<2>, SumRows<3>, SumRows<4>};
@@ -165,9 +160,15 @@ bool AreComparable(const NaviFrame_t* prev, const NaviFrame_t* curr) {
            prev->height == curr->height;
 }
 
+Columns CutColumns(const Meeting& meeting) {
+    Columns columns = {meeting, {}};
+    CutPiece(meeting, 0, &columns.head);
+    return columns;
+}
+
 int32_t CommonArea(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing) {
     int32_t area = 0;
-    ForEachPiece(*pairing.columns, [&](const Piece& piece) {
+    ForEachPiece(*pairing.columns, [&](const ColumnPiece& piece) {
         for (int32_t s = 0; s < pairing.rows->count; ++s) {
             const Span& rows = pairing.rows->spans[s];
             area += kCountRows[piece.steps - 1](
@@ -182,7 +183,7 @@ int32_t CommonArea(const LaidFrame& first, const LaidFrame& second, const Pairin
 int64_t DifferenceSum(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing,
                       int64_t limit) {
     int64_t sum = 0;
-    ForEachPiece(*pairing.columns, [&](const Piece& piece) {
+    ForEachPiece(*pairing.columns, [&](const ColumnPiece& piece) {
         for (int32_t s = 0; s < pairing.rows->count && sum < limit; ++s) {
             const Span& rows = pairing.rows->spans[MiddleFirst(s, pairing.rows->count)];
             sum +=

@@ -73,11 +73,30 @@ struct Meeting {
     }
 };
 
+// Up to 64 neighbouring columns of a meeting: steps of sixteen reach from the first of them to the
+// last. The bytes of mask are 255 for the columns that meet, 0 for others and beyond the last step.
+struct ColumnPiece {
+    int32_t column;
+    int32_t steps;
+    Bytes16 mask[4];
+};
+
+// Columns that meet, none or some, with the first piece of them, which is all in most frames.
+struct Columns {
+    Meeting meeting;
+    ColumnPiece head;
+
+    bool Empty() const { return meeting.count == 0; }
+};
+
+Columns CutColumns(const Meeting& meeting);
+
 // Pixel (r, c) of the first frame meets (r + rows.offset, c + columns.offset) of the second, for
-// each place r of rows and c of columns. All of these lie inside both frames.
+// each place r of rows and c of columns. All of these lie inside both frames; columns are not
+// empty.
 struct Pairing {
     const Meeting* rows;
-    const Meeting* columns;
+    const Columns* columns;
 };
 
 // Pixels of the pairing that are finger in both frames.

@@ -1,5 +1,7 @@
 #include "frame/FullImage.h"
 
+#include <cstring>
+
 #include "base/NaviSimd.h"
 #include "frame/NaviFrame.h"
 #include "param/NaviLimits.h"
@@ -14,49 +16,50 @@ constexpr uint8_t kTypeGap = 255;  // class of a pixel that no sensor pixel belo
 struct Bands {
     int32_t target[3];  // first pixel in the full image
     int32_t length[3];  // pixels
-    int32_t gap;        // pixels between two bands
 };
 
 Bands CutBands(int32_t bound, int32_t center, int32_t gap) {
-    return Bands{{0, bound + gap, bound + center + 2 * gap}, {bound, center, bound}, gap};
+    return Bands{{0, bound + gap, bound + center + 2 * gap}, {bound, center, bound}};
 }
 
-// Sixteen bytes are written at a time, from left to right and from top to bottom: what is too much
-// is overwritten by what follows, and behind the last pixel there is room.
-[[gnu::always_inline]] inline void CopyBytes(const uint8_t* source, int32_t count,
-                                             uint8_t* target) {
-    for (uint8_t* const end = target + count; target < end; target += kLanes, source += kLanes)
+// Bands are short and often of 8 or 40 pixels: a call for each would take longer than the copy.
+inline void CopyBytes(const uint8_t* source, int32_t count, uint8_t* target) {
+    for (; count >= kLanes; count -= kLanes, source += kLanes, target += kLanes)
         Store16(target, Load16(source));
+    if ((count & 8) != 0) {
+        std::memcpy(target, source, 8);
+        source += 8;
+        target += 8;
+    }
+    for (count &= 7; count > 0; --count)
+        *target++ = *source++;
 }
 
-[[gnu::always_inline]] inline void FillBytes(Bytes16 value, int32_t count, uint8_t* target) {
-    for (uint8_t* const end = target + count; target < end; target += kLanes)
-        Store16(target, value);
-}
-
-// Spreads a row of the frame: its three bands, and what is between them.
-[[gnu::always_inline]] inline void SpreadRow(const uint8_t* source, const Bands& columns,
-                                             Bytes16 gap, uint8_t* target) {
-    const int32_t bound = columns.length[0];
-    const int32_t center = columns.length[1];
-    CopyBytes(source, bound, target);
-    FillBytes(gap, columns.gap, target + bound);
-    CopyBytes(source + bound, center, target + columns.target[1]);
-    FillBytes(gap, columns.gap, target + columns.target[1] + center);
-    CopyBytes(source + bound + center, bound, target + columns.target[2]);
+void FillBytes(uint8_t value, int32_t count, uint8_t* target) {
+    constexpr int32_t kStep = 4 * kLanes;
+    const Bytes16 bytes = Splat16(value);
+    for (; count >= kStep; count -= kStep, target += kStep) {
+        for (int32_t n = 0; n < kStep; n += kLanes)
+            Store16(target + n, bytes);
+    }
+    std::memset(target, value, static_cast<size_t>(count));
 }
 
 // Spreads one plane of the frame into the full image's; gap pixels are value.
-void SpreadPlane(const uint8_t* source, Bands rows, Bands columns, uint8_t value, uint8_t* target) {
-    const Bytes16 gap = Splat16(value);
-    const int32_t width = 2 * columns.length[0] + columns.length[1];
-    const int32_t fullWidth = width + 2 * columns.gap;
+void SpreadPlane(const uint8_t* source, const Bands& rows, const Bands& columns, uint8_t value,
+                 uint8_t* target) {
+    const int32_t bound = columns.length[0];
+    const int32_t center = columns.length[1];
+    const int32_t fullWidth = columns.target[2] + bound;
+    FillBytes(value, fullWidth * (rows.target[2] + rows.length[2]), target);
     for (int32_t r = 0; r < 3; ++r) {
-        for (int32_t n = 0; n < rows.length[r]; ++n, source += width, target += fullWidth)
-            SpreadRow(source, columns, gap, target);
-        const int32_t gapBytes = r < 2 ? rows.gap * fullWidth : 0;
-        FillBytes(gap, gapBytes, target);
-        target += gapBytes;
+        uint8_t* row = target + rows.target[r] * fullWidth;
+        for (int32_t n = 0; n < rows.length[r]; ++n, row += fullWidth) {
+            CopyBytes(source, bound, row);
+            CopyBytes(source + bound, center, row + columns.target[1]);
+            CopyBytes(source + bound + center, bound, row + columns.target[2]);
+            source += 2 * bound + center;
+        }
     }
 }
 
@@ -81,7 +84,7 @@ int32_t GetFullImg(const NaviFrame_t* img, NaviFrame_t* full_img) {
     full_img->width = img->width + 2 * s_gapWidth;
     full_img->height = img->height + 2 * s_gapHeight;
     const int32_t size = full_img->width * full_img->height;  // at most 2^24
-    if (!ReplaceBuffers(full_img, size + kLanes))
+    if (!ReplaceBuffers(full_img, size))
         return -1;
     const Bands columns = CutBands(s_boundWidth, s_centerWidth, s_gapWidth);
     const Bands rows = CutBands(s_boundHeight, s_centerHeight, s_gapHeight);

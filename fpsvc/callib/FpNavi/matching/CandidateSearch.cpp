@@ -76,10 +76,12 @@ class Selection {
         }
         for (; any != 0; any &= any - 1) {
             const int32_t bit = __builtin_ctzll(any);
-            for (int32_t t = 0; t < m_count; ++t) {
-                if ((kept[t] >> bit & 1U) != 0)
-                    Take(m_placed[t], row, column + bit);
-            }
+            // Mostly one template has the bit: a branch for each would be mispredicted.
+            uint32_t having = 0;
+            for (int32_t t = 0; t < m_count; ++t)
+                having |= static_cast<uint32_t>(kept[t] >> bit & 1U) << t;
+            for (; having != 0; having &= having - 1)
+                Take(m_placed[__builtin_ctz(having)], row, column + bit);
         }
     }
 

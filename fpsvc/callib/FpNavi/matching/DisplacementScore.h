@@ -17,8 +17,7 @@
 
 namespace fpnavi {
 
-inline constexpr int32_t kStepNum = 2 * kBandMax - 1;  // from a band to any other: -2 .. 2
-inline constexpr int32_t kDiffWorst = 255;             // score of too little common finger area
+inline constexpr int32_t kDiffWorst = 255;  // score of too little common finger area
 
 // One axis of the frames, cut into bands with a gap between two of them.
 struct TileAxis {
@@ -28,18 +27,31 @@ struct TileAxis {
     int32_t fullSide;  // of the full image
 };
 
-// What meets along one axis at a displacement, without the steps at which nothing does.
-struct AxisMeetings {
+// What meets along the rows at a displacement, a meeting for each step at which anything does: a
+// displacement leads to bands further on or to bands before, so that there are at most three steps.
+struct RowMeetings {
     int32_t displacement;
     int32_t places;  // in all steps
     int32_t count;
-    Meeting steps[kStepNum];
+    Meeting steps[kBandMax];
 };
+
+// The same along the columns. A slot holds what the last displacement that came to it needed.
+struct ColumnMeetings {
+    int32_t displacement;
+    int32_t places;
+    int32_t count;  // -1 in an empty slot
+    Columns steps[kBandMax];
+};
+
+inline constexpr int32_t kColumnSlots = 32;  // of a search; candidates often share their columns
 
 // Scores displacements of a pair of frames, one after the other.
 class DisplacementScore {
   public:
-    DisplacementScore(const SearchParams& params, const FramePair& pair);
+    // slots [out]: count of them, a power of two, the caller's.
+    DisplacementScore(const SearchParams& params, const FramePair& pair, ColumnMeetings* slots,
+                      int32_t count);
 
     // Mean grey difference over the finger area that both frames have in common when pixel
     // (row, column) of pair.Cut() meets (row + di, column + dj) of pair.Searched(), counted in the
@@ -48,16 +60,16 @@ class DisplacementScore {
     int32_t At(const Displacement& displacement, int32_t most);
 
   private:
-    template <typename Visit>
-    void ForEachPairing(Visit visit) const;
+    const ColumnMeetings& ColumnsAt(int32_t dj);
 
     const LaidFrame& m_first;
     const LaidFrame& m_second;
     const int32_t m_overlapAreaMin;
     const TileAxis m_rowAxis;
     const TileAxis m_columnAxis;
-    AxisMeetings m_rows;  // of the last displacement: neighbouring candidates often share them
-    AxisMeetings m_columns;
+    RowMeetings m_rows;  // of the last displacement
+    ColumnMeetings* const m_slots;
+    const int32_t m_slotMask;
 };
 
 }  // namespace fpnavi

@@ -163,6 +163,7 @@ SearchMemory PlanMemory(const SearchParams& params, const TemplateSet& set, uint
     memory.packed = take(static_cast<size_t>(pieces) * kAlike * kPiecePixels);
     memory.strips = take(kStripsBytes);
     memory.sums = reinterpret_cast<uint32_t*>(take(pieces > 1 ? kSums : 0));
+    memory.columns = reinterpret_cast<ColumnMeetings*>(take(kColumnSlots * sizeof(ColumnMeetings)));
     memory.scores = take(static_cast<size_t>(scores) + kLanes);
     return memory;
 }

@@ -5,6 +5,7 @@
 
 #include <cstdint>
 
+#include "matching/DisplacementScore.h"
 #include "matching/Templates.h"
 
 namespace fpnavi {
@@ -23,12 +24,13 @@ struct PlacementTable {
 
 // The memory of one candidate search.
 struct SearchMemory {
-    uint32_t* keys;   // one for each candidate
-    uint8_t* packed;  // the templates' pieces
-    uint8_t* strips;  // of the searched frame
-    uint32_t* sums;   // of placements of templates of more than one piece
-    uint8_t* scores;  // all tables, and 15 bytes that a step of sixteen may read
-    size_t bytes;     // of all
+    uint32_t* keys;           // one for each candidate
+    uint8_t* packed;          // the templates' pieces
+    uint8_t* strips;          // of the searched frame
+    uint32_t* sums;           // of placements of templates of more than one piece
+    ColumnMeetings* columns;  // of the match, kColumnSlots
+    uint8_t* scores;          // all tables, and 15 bytes that a step of sixteen may read
+    size_t bytes;             // of all
 };
 
 // Plans the memory of a search. Without a block only the number of bytes is meant.

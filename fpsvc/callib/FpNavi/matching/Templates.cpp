@@ -53,7 +53,7 @@ bool IsValid(const Template& tplt, const LaidFrame& frame, int32_t tpltSize) {
     if (IsEmpty(tplt))
         return false;
     const Meeting rows = {0, tplt.height, 1, {{tplt.i0, tplt.i0 + tplt.height}}};
-    const Meeting columns = {0, tplt.width, 1, {{tplt.j0, tplt.j0 + tplt.width}}};
+    const Columns columns = CutColumns({0, tplt.width, 1, {{tplt.j0, tplt.j0 + tplt.width}}});
     const int64_t cnt = CommonArea(frame, frame, {&rows, &columns});
     return 100 * cnt / tpltSize > kTpltCoverageMin;
 }

@@ -39,7 +39,8 @@ Bands CutBands(int32_t side, int32_t bound) {
 
 // Places of the bands that lie in the same band after the shift. A pixel of the previous frame
 // meets that of the current one shift places before it.
-Meeting StayIn(int32_t shift, const Span& a, const Span& b = {0, 0}, const Span& c = {0, 0}) {
+Meeting StayIn(int32_t shift, const Span& a = {0, 0}, const Span& b = {0, 0},
+               const Span& c = {0, 0}) {
     Meeting meeting = {-shift, 0, 0, {}};
     for (const Span& band : {a, b, c})
         meeting.Add(Meet(band, band, -shift));
@@ -47,116 +48,147 @@ Meeting StayIn(int32_t shift, const Span& a, const Span& b = {0, 0}, const Span&
 }
 
 // What is compared at one shift: five regions, the centre and four border bands without the
-// corners. Regions that overlap are pairings of their own: a pixel of both counts twice.
-struct Regions {
-    int32_t count;
-    Meeting rows[kRegionMax];
-    Meeting columns[kRegionMax];
-
-    void Add(const Meeting& ofRows, const Meeting& ofColumns) {
-        if (ofRows.count == 0 || ofColumns.count == 0)
-            return;
-        rows[count] = ofRows;
-        columns[count] = ofColumns;
-        ++count;
-    }
-    Pairing At(int32_t region) const { return {&rows[region], &columns[region]}; }
+// corners. Rows of the centre meet in all columns, rows of the borders in those of the centre.
+// Bands that overlap are kept apart: a pixel of both counts twice.
+struct ShiftedRows {
+    Meeting centre;
+    Meeting borders[2];
 };
 
-Regions ShiftRegions(const Bands& rows, const Bands& columns, int32_t dr, int32_t dc) {
+struct ShiftedColumns {
+    Columns centre;
+    Columns all[2];
+};
+
+ShiftedRows ShiftRows(const Bands& bands, int32_t dr) {
+    if (bands.Overlap())
+        return {StayIn(dr, bands.centre), {StayIn(dr, bands.first), StayIn(dr, bands.last)}};
+    return {StayIn(dr, bands.centre), {StayIn(dr, bands.first, bands.last), StayIn(dr)}};
+}
+
+ShiftedColumns ShiftColumns(const Bands& bands, int32_t dc) {
+    const Columns centre = CutColumns(StayIn(dc, bands.centre));
+    if (bands.Overlap())
+        return {centre, {CutColumns(StayIn(dc, bands.first)), CutColumns(StayIn(dc, bands.last))}};
+    return {
+        centre,
+        {CutColumns(StayIn(dc, bands.first, bands.centre, bands.last)), CutColumns(StayIn(dc))}};
+}
+
+struct Regions {
+    int32_t count;
+    Pairing pairings[kRegionMax];
+
+    void Add(const Meeting& rows, const Columns& columns) {
+        if (rows.count > 0 && !columns.Empty())
+            pairings[count++] = {&rows, &columns};
+    }
+};
+
+Regions PairRegions(const ShiftedRows& rows, const ShiftedColumns& columns) {
     Regions regions;
     regions.count = 0;
-    const Meeting centreRows = StayIn(dr, rows.centre);
-    const Meeting centreColumns = StayIn(dc, columns.centre);
-    if (columns.Overlap()) {
-        regions.Add(centreRows, StayIn(dc, columns.first));
-        regions.Add(centreRows, StayIn(dc, columns.last));
-    } else {
-        regions.Add(centreRows, StayIn(dc, columns.first, columns.centre, columns.last));
-    }
-    if (rows.Overlap()) {
-        regions.Add(StayIn(dr, rows.first), centreColumns);
-        regions.Add(StayIn(dr, rows.last), centreColumns);
-    } else {
-        regions.Add(StayIn(dr, rows.first, rows.last), centreColumns);
-    }
+    regions.Add(rows.centre, columns.all[0]);
+    regions.Add(rows.centre, columns.all[1]);
+    regions.Add(rows.borders[0], columns.centre);
+    regions.Add(rows.borders[1], columns.centre);
     return regions;
 }
 
-// The test of one pair of frames.
-struct ShiftTest {
-    const LaidFrame& prev;
-    const LaidFrame& curr;
-    const NoMoveLimits& limits;
-    Bands rows;
-    Bands columns;
-
-    bool AreaCounts(int32_t area) const { return area >= 1 && area >= limits.overlapAreaMin; }
-    int32_t Area(const Regions& regions) const;
-    // A bound of Area: the pixels of the regions, or the finger area of a frame when no pixel
-    // counts more than twice.
-    int64_t MostArea(const Regions& regions) const;
-    int64_t Sum(const Regions& regions, int64_t limit) const;
-    bool IsBelowTolerance(const Regions& regions, int32_t area) const;
-};
-
 constexpr int32_t kAreaUnknown = -1;
 
-int32_t ShiftTest::Area(const Regions& regions) const {
-    int32_t area = 0;
-    for (int32_t i = 0; i < regions.count; ++i)
-        area += CommonArea(prev, curr, regions.At(i));
-    return area;
-}
+// The test of one pair of frames.
+class ShiftTest {
+  public:
+    ShiftTest(const LaidFrame& prev, const LaidFrame& curr, const NoMoveLimits& limits)
+        : m_prev(prev),
+          m_curr(curr),
+          m_limits(limits),
+          m_rows(CutBands(prev.height, limits.boundHeight)),
+          m_columns(CutBands(prev.width, limits.boundWidth)) {}
 
-int64_t ShiftTest::MostArea(const Regions& regions) const {
-    int64_t pixels = 0;
-    for (int32_t i = 0; i < regions.count; ++i)
-        pixels += int64_t{regions.rows[i].places} * regions.columns[i].places;
-    const int64_t times = rows.Overlap() || columns.Overlap() ? 2 : 1;
-    return std::min(pixels, times * std::min(prev.area, curr.area));
-}
+    // Some shift has enough common finger area, as far as shifts were tested.
+    bool Counted() const { return m_counted; }
 
-int64_t ShiftTest::Sum(const Regions& regions, int64_t limit) const {
-    int64_t sum = 0;
-    for (int32_t i = 0; i < regions.count && sum < limit; ++i)
-        sum += DifferenceSum(prev, curr, regions.At(i), limit - sum);
-    return sum;
-}
+    // Tests the shifts within the limits, first none at all, until one is below the tolerance.
+    // Returns whether one is.
+    bool TestShifts() {
+        if (m_limits.tolRow < 0 || m_limits.tolCol < 0)  // no shift at all
+            return false;
+        // Beyond the frame's sides no pixel meets another.
+        const int32_t drMax = std::min(m_limits.tolRow, m_prev.height);
+        const int32_t dcMax = std::min(m_limits.tolCol, m_prev.width);
+        if (Test(0, ShiftColumns(m_columns, 0)))
+            return true;
+        for (int32_t dc = -dcMax; dc <= dcMax; ++dc) {
+            const ShiftedColumns columns = ShiftColumns(m_columns, dc);
+            for (int32_t dr = -drMax; dr <= drMax; ++dr) {
+                if ((dr != 0 || dc != 0) && Test(dr, columns))
+                    return true;
+            }
+        }
+        return false;
+    }
+
+  private:
+    bool Test(int32_t dr, const ShiftedColumns& columns) {
+        const ShiftedRows rows = ShiftRows(m_rows, dr);
+        const Regions regions = PairRegions(rows, columns);
+        const int32_t area = m_counted ? kAreaUnknown : Area(regions);
+        m_counted = m_counted || AreaCounts(area);
+        return IsBelowTolerance(regions, area);
+    }
+
+    bool AreaCounts(int32_t area) const { return area >= 1 && area >= m_limits.overlapAreaMin; }
+
+    int32_t Area(const Regions& regions) const {
+        int32_t area = 0;
+        for (int32_t i = 0; i < regions.count; ++i)
+            area += CommonArea(m_prev, m_curr, regions.pairings[i]);
+        return area;
+    }
+
+    // A bound of Area: the pixels of the regions, or the finger area of a frame when no pixel
+    // counts more than twice.
+    int64_t MostArea(const Regions& regions) const {
+        int64_t pixels = 0;
+        for (int32_t i = 0; i < regions.count; ++i)
+            pixels += int64_t{regions.pairings[i].rows->places} *
+                      regions.pairings[i].columns->meeting.places;
+        const int64_t times = m_rows.Overlap() || m_columns.Overlap() ? 2 : 1;
+        return std::min(pixels, times * std::min(m_prev.area, m_curr.area));
+    }
+
+    int64_t Sum(const Regions& regions, int64_t limit) const {
+        int64_t sum = 0;
+        for (int32_t i = 0; i < regions.count && sum < limit; ++i)
+            sum += DifferenceSum(m_prev, m_curr, regions.pairings[i], limit - sum);
+        return sum;
+    }
+
+    bool IsBelowTolerance(const Regions& regions, int32_t area) const;
+
+    const LaidFrame& m_prev;
+    const LaidFrame& m_curr;
+    const NoMoveLimits& m_limits;
+    const Bands m_rows;
+    const Bands m_columns;
+    bool m_counted = false;
+};
 
 // mean < tolerance means sum < tolerance * area: a sum that reaches the product with an area too
-// large is not below. A sum that may wrap is taken in full.
+// large is not below. A sum that may wrap is taken in full. area: Area(regions), or kAreaUnknown.
 bool ShiftTest::IsBelowTolerance(const Regions& regions, int32_t area) const {
     const int64_t most = MostArea(regions);
     const bool mayWrap = most * kGreyMax > std::numeric_limits<int32_t>::max();
     const int64_t limit =
-        mayWrap ? std::numeric_limits<int64_t>::max() : int64_t{limits.diffTol} * most;
+        mayWrap ? std::numeric_limits<int64_t>::max() : int64_t{m_limits.diffTol} * most;
     const int64_t sum = Sum(regions, limit);
     if (sum >= limit)
         return false;
     if (area == kAreaUnknown)
         area = Area(regions);
-    return AreaCounts(area) && Wrap(sum) / area < limits.diffTol;
-}
-
-// Calls visit with every shift within the limits, first with none at all, until it returns true.
-// Returns whether it did.
-template <typename Visit>
-bool VisitShifts(const LaidFrame& frame, const NoMoveLimits& limits, Visit visit) {
-    if (limits.tolRow < 0 || limits.tolCol < 0)  // no shift at all
-        return false;
-    // Beyond the frame's sides no pixel meets another.
-    const int32_t drMax = std::min(limits.tolRow, frame.height);
-    const int32_t dcMax = std::min(limits.tolCol, frame.width);
-    if (visit(0, 0))
-        return true;
-    for (int32_t dr = -drMax; dr <= drMax; ++dr) {
-        for (int32_t dc = -dcMax; dc <= dcMax; ++dc) {
-            if ((dr != 0 || dc != 0) && visit(dr, dc))
-                return true;
-        }
-    }
-    return false;
+    return AreaCounts(area) && Wrap(sum) / area < m_limits.diffTol;
 }
 
 }  // namespace
@@ -167,20 +199,12 @@ NoMoveLimits CurrentNoMoveLimits() {
 }
 
 int32_t TestNoMove(const LaidFrame& prev, const LaidFrame& curr, const NoMoveLimits& limits) {
-    const ShiftTest test = {prev, curr, limits, CutBands(prev.height, limits.boundHeight),
-                            CutBands(prev.width, limits.boundWidth)};
-    bool counted = false;
-    const auto visit = [&](int32_t dr, int32_t dc) {
-        const Regions regions = ShiftRegions(test.rows, test.columns, dr, dc);
-        const int32_t area = counted ? kAreaUnknown : test.Area(regions);
-        counted = counted || test.AreaCounts(area);
-        return test.IsBelowTolerance(regions, area);
-    };
-    if (VisitShifts(prev, limits, visit))
+    ShiftTest test(prev, curr, limits);
+    if (test.TestShifts())
         return kNoMoveResting;
-    if (!counted && kMeanNone < limits.diffTol)
+    if (!test.Counted() && kMeanNone < limits.diffTol)
         return kNoMoveResting;
-    return counted ? kNoMoveMoved : kNoMoveUndetermined;
+    return test.Counted() ? kNoMoveMoved : kNoMoveUndetermined;
 }
 
 int32_t FingerNoMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
