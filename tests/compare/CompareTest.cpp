@@ -90,7 +90,7 @@ void ReplayPictures(uint64_t test, Mode mode, MakeParams makeParams, int64_t per
         while (!CheapEnough(params))
             params = makeParams(random, mode);
         twin.SetParam(&params);
-        if (!twin.ImageFits())
+        if (!Twin::ImageFits())
             continue;
         twin.Clear();
         const host::Geometry geometry = host::GeometryOf(params);
@@ -188,7 +188,7 @@ TEST(CompareTuning, RunsOfAllModes) {
         if (random.Chance(30))
             host::ParamValue(params, "_NAVI_TimeOut_threshold") = random.Range(-1, 6);
         twin.SetParam(&params);
-        if (!twin.ImageFits())
+        if (!Twin::ImageFits())
             continue;
         twin.SetDac(static_cast<uint32_t>(random.Next()));
         const uint32_t gainMask = random.Chance(90) ? 0x00070707U : 0xFFFFFFFFU;

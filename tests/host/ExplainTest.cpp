@@ -15,7 +15,6 @@ using host::Mode;
 using host::SettledBy;
 using host_test::GestureBuilder;
 using host_test::Rect;
-using ::testing::Each;
 using ::testing::ElementsAre;
 
 std::vector<SettledBy> Settled(const Explanation& explanation) {

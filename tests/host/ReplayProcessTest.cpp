@@ -47,6 +47,7 @@ Gesture Resting(const std::string& id) {
 
 std::vector<std::string> Ids(const std::vector<ReplayResult>& results) {
     std::vector<std::string> ids;
+    ids.reserve(results.size());
     for (const ReplayResult& result : results)
         ids.push_back(result.id);
     return ids;

@@ -77,7 +77,7 @@ using Displacements = std::vector<std::pair<int32_t, int32_t>>;  // rows, column
 
 class Candidates : public NaviTest {
   protected:
-    void Load(TestFrame& prev, TestFrame& curr) {
+    static void Load(TestFrame& prev, TestFrame& curr) {
         ASSERT_EQ(ImgCopy(&s_imagePrev, prev.Get()), 0);
         ASSERT_EQ(ImgCopy(&s_imageCurr, curr.Get()), 0);
     }
