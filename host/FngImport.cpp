@@ -193,7 +193,7 @@ RecordedFrame ReadFrame(const FngFile& file, size_t offset, const Geometry& geom
     if (file.U8(offset + kContactOffset) > 100)
         file.Fail(offset + kContactOffset, fmt::format("contact {}, expected 0 to 100 percent",
                                                        file.U8(offset + kContactOffset)));
-    const int presence = static_cast<int8_t>(file.U8(offset + kPresenceOffset));
+    const auto presence = static_cast<int8_t>(file.U8(offset + kPresenceOffset));
     if (presence < -1 || presence > 1)
         file.Fail(offset + kPresenceOffset,
                   fmt::format("presence {}, expected -1, 0 or 1", presence));

@@ -138,9 +138,10 @@ void CheckIdentity(const Database& database) {
                                     : ""));
     // Reading the schema shows missing tables and columns now rather than at the first gesture.
     constexpr const char* kDoing = "find the tables of a recording store";
-    Statement(database, "SELECT id, params FROM param_block", kDoing);
-    Statement(database, "SELECT seq, id, param_block, frame_count FROM gesture", kDoing);
-    Statement(database, "SELECT gesture, frame_index, raw FROM frame", kDoing);
+    for (const char* sql : {"SELECT id, params FROM param_block",
+                            "SELECT seq, id, param_block, frame_count FROM gesture",
+                            "SELECT gesture, frame_index, raw FROM frame"})
+        const Statement readable(database, sql, kDoing);
 }
 
 bool IsInt32(const nlohmann::json& value) {

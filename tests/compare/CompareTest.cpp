@@ -173,6 +173,15 @@ TEST(CompareFailedAllocations, EveryAllocationOfALaterFrame) {
     }
 }
 
+// An image of any size that the parameters may ask for; its first 4096 pixels are noise around a
+// level.
+std::vector<uint8_t> NoisyImage(int32_t level, int32_t spread, SimRandom& random) {
+    std::vector<uint8_t> image(size_t{1} << 20);
+    for (size_t p = 0; p < 4096; ++p)
+        image[p] = static_cast<uint8_t>(std::clamp(level + random.Range(-spread, spread), 0, 255));
+    return image;
+}
+
 // Tuning runs with gestures between them.
 TEST(CompareTuning, RunsOfAllModes) {
     Twin& twin = Twin::Get();
@@ -197,12 +206,7 @@ TEST(CompareTuning, RunsOfAllModes) {
         const int32_t base = random.Range(0, 255);
         const int32_t spread = random.Chance(40) ? 2 : random.Range(1, 100);
         for (int32_t call = 0; call < random.Range(1, 8); ++call) {
-            std::vector<uint8_t> image(size_t{1} << 20);
-            const int32_t level = base + random.Range(-60, 60);
-            for (size_t p = 0; p < 4096; ++p)
-                image[p] =
-                    static_cast<uint8_t>(std::clamp(level + random.Range(-spread, spread), 0, 255));
-            twin.Tune(image, gain20, gain2C);
+            twin.Tune(NoisyImage(base + random.Range(-60, 60), spread, random), gain20, gain2C);
             if (random.Chance(10))
                 twin.SetDac(static_cast<uint32_t>(random.Next()));
             if (random.Chance(10))

@@ -82,7 +82,7 @@ class Candidates : public NaviTest {
         ASSERT_EQ(ImgCopy(&s_imageCurr, curr.Get()), 0);
     }
     // All candidates, sorted: their order in the heap does not matter to a reader.
-    Displacements Find(TestFrame& prev, TestFrame& curr, int32_t expected = 0) {
+    static Displacements Find(TestFrame& prev, TestFrame& curr, int32_t expected = 0) {
         Load(prev, curr);
         const auto number = static_cast<size_t>(s_candidateNum);
         std::vector<int32_t> di(number);
