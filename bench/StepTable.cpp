@@ -20,11 +20,10 @@ void Compare(benchmark::State& state, const Options& options, const Comparison& 
 }
 
 void AddSteps(const Options& options) {
-    for (const Comparison& comparison : Comparisons()) {
+    for (const Comparison& comparison : Comparisons())
         AddRow(comparison.name, options, [options, &comparison](benchmark::State& state) {
             Compare(state, options, comparison);
         });
-    }
 }
 
 }  // namespace

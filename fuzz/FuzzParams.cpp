@@ -3,6 +3,7 @@
 #include <limits>
 #include <string>
 
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi_fuzz {
@@ -152,12 +153,12 @@ bool PairIsCheap(double limit) {
     const double full = AtLeast0(s_fullImageWidth) * AtLeast0(s_fullImageHeight);
     const double shifts =
         AtLeast0(2.0 * s_smallMoveTolRow + 1) * AtLeast0(2.0 * s_smallMoveTolCol + 1) * image;
-    const double match = AtLeast0(s_candidateNum) * (s_multiBloclkFlag == 1 ? full : image);
-    const double search =
-        s_tpltNum / 2 *
-        (SearchWork(s_tpltWidthUD, s_tpltHeightUD) + SearchWork(s_tpltWidthLR, s_tpltHeightLR));
+    const double match = AtLeast0(s_candidateNum) * (IsTiled() ? full : image);
+    const int32_t ofEachShape = s_tpltNum / 2;
+    const double search = ofEachShape * (SearchWork(s_tpltWidthUD, s_tpltHeightUD) +
+                                         SearchWork(s_tpltWidthLR, s_tpltHeightLR));
     const double work = shifts + match + search;
-    return s_modeFlag == 1 || work <= limit || work > kRefused;
+    return IsHg() || work <= limit || work > kRefused;
 }
 
 }  // namespace fpnavi_fuzz

@@ -73,7 +73,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     const host::ParamBlock params = fpnavi_fuzz::ChangedParams(source);
     twin.SetParam(&params);
     const bool drawable = int64_t{fpnavi::s_imageWidth} * fpnavi::s_imageHeight <= kPixelsMax;
-    if (twin.ImageFits() && drawable && fpnavi_fuzz::PairIsCheap(kWorkMax)) {
+    if (Twin::ImageFits() && drawable && fpnavi_fuzz::PairIsCheap(kWorkMax)) {
         twin.Clear();
         OneGesture(source);
         twin.Clear();

@@ -11,6 +11,7 @@
 #include "FuzzParams.h"
 #include "alog_host.h"
 #include "param/NaviLimits.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace {
@@ -48,7 +49,7 @@ int64_t BytesOf(int32_t width, int32_t height) {
 // The finger test reads as many bytes as the larger of two images has.
 int64_t StatusBytes() {
     const int64_t image = BytesOf(fpnavi::s_imageWidth, fpnavi::s_imageHeight);
-    if (fpnavi::s_modeFlag != 1 || image < 0)
+    if (!fpnavi::IsHg() || image < 0)
         return image;
     const int64_t hg = BytesOf(fpnavi::s_imageWidthHg, fpnavi::s_imageHeightHg);
     return hg < 0 ? hg : std::max(image, hg);

@@ -8,9 +8,8 @@ namespace host {
 namespace {
 
 std::string Message(const std::string& file, const std::string& place, const std::string& problem) {
-    if (place.empty()) {
+    if (place.empty())
         return file + ": " + problem;
-    }
     const bool isLine = place[0] >= '0' && place[0] <= '9';
     return file + (isLine ? ":" : ": ") + place + ": " + problem;
 }

@@ -5,6 +5,7 @@
 #include "gesture/NaviVoteInfo.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace host {
@@ -79,7 +80,7 @@ class Tracer {
             return SettledBy::FirstFrame;
         if (fpnavi::s_voteInfo.calc_cnt == m_pairsBefore)
             return m_pairsBefore >= kPairMax ? SettledBy::RecordFull : SettledBy::CoverageMinimum;
-        return fpnavi::s_modeFlag == 1 ? SettledBy::CentroidOnly : SettledFpPair();
+        return fpnavi::IsHg() ? SettledBy::CentroidOnly : SettledFpPair();
     }
 
     void ReadPair(FrameTrace* trace) const {
@@ -88,7 +89,7 @@ class Tracer {
         trace->truth = Truth(trace->frame);
         if (trace->settledBy == SettledBy::RecordFull)
             return;
-        if (fpnavi::s_doubleScanFlag == 1)  // written before the coverage gate
+        if (fpnavi::ScansTwice())  // written before the coverage gate
             trace->doubleScan = {record.dx_ds[n], record.dy_ds[n], record.cvr_ds[n + 1]};
         if (trace->settledBy == SettledBy::CoverageMinimum)
             return;

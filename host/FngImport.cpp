@@ -64,46 +64,38 @@ struct FngFile {
     }
     // The 16-bit field must have that value.
     void Expect16(size_t offset, int expected, const char* name) const {
-        if (U16(offset) != expected) {
+        if (U16(offset) != expected)
             Fail(offset, fmt::format("{} {}, expected {}", name, U16(offset), expected));
-        }
     }
 };
 
 void CheckStart(FngFile& file) {
-    if (file.bytes.size() < kHeaderSize) {
+    if (file.bytes.size() < kHeaderSize)
         file.Fail(file.bytes.size(), fmt::format("the file is truncated, expected a header of {} "
                                                  "bytes",
                                                  kHeaderSize));
-    }
-    if (std::memcmp(file.bytes.data(), kMagic, sizeof kMagic) != 0) {
+    if (std::memcmp(file.bytes.data(), kMagic, sizeof kMagic) != 0)
         file.Fail(0, "not a .fng recording, expected it to begin with FNG1");
-    }
     file.Expect16(kVersionOffset, kVersion, "version");
     file.flags = file.U16(kFlagsOffset);
-    if ((file.flags & ~(kFlagBlocks | kFlagRegisters)) != 0) {
+    if ((file.flags & ~(kFlagBlocks | kFlagRegisters)) != 0)
         file.Fail(kFlagsOffset, fmt::format("flags {:#x}, expected bits 0 and 1 only", file.flags));
-    }
 }
 
 void ReadModeAndParams(const FngFile& file, Gesture& gesture) {
     const int mode = file.U8(kModeOffset);
-    if (mode > static_cast<int>(Mode::DoubleScan)) {
+    if (mode > static_cast<int>(Mode::DoubleScan))
         file.Fail(kModeOffset, fmt::format("mode {}, expected 0 fp, 1 hg or 2 ds", mode));
-    }
     gesture.mode = static_cast<Mode>(mode);
-    if (file.HasRegisters() != (gesture.mode == Mode::DoubleScan)) {
+    if (file.HasRegisters() != (gesture.mode == Mode::DoubleScan))
         file.Fail(kFlagsOffset,
                   fmt::format("flags {:#x}, expected bit 1 (registers) in mode ds and in no other",
                               file.flags));
-    }
     const int layout = file.U8(kLayoutOffset);
-    if (layout > 1) {
+    if (layout > 1)
         file.Fail(kLayoutOffset, fmt::format("layout {}, expected 0 plain or 1 tiled", layout));
-    }
-    if (layout == 1 && gesture.mode == Mode::Hg) {
+    if (layout == 1 && gesture.mode == Mode::Hg)
         file.Fail(kLayoutOffset, "layout 1 (tiled), expected 0 in mode hg");
-    }
     gesture.params = ParamsForMode(gesture.mode, layout == 0);
     gesture.geometry = GeometryOf(gesture.params);
     gesture.tags.emplace_back(layout == 0 ? "plain" : "tiled");
@@ -120,22 +112,19 @@ void CheckGeometry(const FngFile& file, const Geometry& geometry) {
 
 void ReadOutcome(const FngFile& file, Gesture& gesture) {
     const int label = file.U8(kLabelOffset);
-    if (label != kNoLabel && !IsKey(label)) {
+    if (label != kNoLabel && !IsKey(label))
         file.Fail(kLabelOffset, fmt::format("key {}, expected 0 to 5 or 255 for none", label));
-    }
     if (label != kNoLabel) {
         gesture.label = label;
         gesture.accepted = {label};
     }
     const int end = file.U8(kEndOffset);
-    if (end > 1) {
+    if (end > 1)
         file.Fail(kEndOffset, fmt::format("end {}, expected 0 lift or 1 timeout", end));
-    }
     gesture.end = static_cast<GestureEnd>(end);
     for (size_t offset = kReservedOffset; offset < kHeaderSize; ++offset) {
-        if (file.U8(offset) != 0) {
+        if (file.U8(offset) != 0)
             file.Fail(offset, fmt::format("reserved byte {}, expected 0", file.U8(offset)));
-        }
     }
 }
 
@@ -146,20 +135,17 @@ size_t PixelBytes(const FngFile& file, const Geometry& geometry) {
 
 size_t CheckSize(const FngFile& file, const Geometry& geometry) {
     const auto count = static_cast<size_t>(file.U16(kFrameCountOffset));
-    if (count == 0) {
+    if (count == 0)
         file.Fail(kFrameCountOffset, "0 frames, expected at least 1");
-    }
     const size_t expected = kHeaderSize + count * (kFrameHeadSize + PixelBytes(file, geometry));
-    if (file.bytes.size() < expected) {
+    if (file.bytes.size() < expected)
         file.Fail(
             file.bytes.size(),
             fmt::format("the file is truncated, expected {} bytes for {} frames", expected, count));
-    }
-    if (file.bytes.size() > expected) {
+    if (file.bytes.size() > expected)
         file.Fail(expected, fmt::format("{} bytes after the last frame, expected {} bytes for {} "
                                         "frames",
                                         file.bytes.size() - expected, expected, count));
-    }
     return count;
 }
 
@@ -188,11 +174,10 @@ std::vector<uint8_t> ReadPixels(const FngFile& file, size_t offset, const Geomet
     std::vector<uint8_t> raw(size);
     ForEachPixel(geometry, [&](size_t rawIndex, size_t imageIndex) {
         raw[rawIndex] = rows[imageIndex];
-        if (file.HasBlocks() && rows[size + rawIndex] != rows[imageIndex]) {
+        if (file.HasBlocks() && rows[size + rawIndex] != rows[imageIndex])
             file.Fail(offset + size + rawIndex,
                       fmt::format("block-ordered byte {}, expected {} as at byte {} of the image",
                                   rows[size + rawIndex], rows[imageIndex], offset + imageIndex));
-        }
     });
     return raw;
 }
@@ -201,20 +186,17 @@ RecordedFrame ReadFrame(const FngFile& file, size_t offset, const Geometry& geom
     RecordedFrame frame;
     frame.reg24 = ReadLe32(&file.bytes[offset]);
     frame.reg28 = ReadLe32(&file.bytes[offset + kReg28Offset]);
-    if (!file.HasRegisters() && (frame.reg24 != 0 || frame.reg28 != 0)) {
+    if (!file.HasRegisters() && (frame.reg24 != 0 || frame.reg28 != 0))
         file.Fail(offset, "zone registers are set, expected 0 outside mode ds");
-    }
     frame.x16 = static_cast<int16_t>(file.U16(offset + kXOffset));
     frame.y16 = static_cast<int16_t>(file.U16(offset + kYOffset));
-    if (file.U8(offset + kContactOffset) > 100) {
+    if (file.U8(offset + kContactOffset) > 100)
         file.Fail(offset + kContactOffset, fmt::format("contact {}, expected 0 to 100 percent",
                                                        file.U8(offset + kContactOffset)));
-    }
-    const int presence = static_cast<int8_t>(file.U8(offset + kPresenceOffset));
-    if (presence < -1 || presence > 1) {
+    const auto presence = static_cast<int8_t>(file.U8(offset + kPresenceOffset));
+    if (presence < -1 || presence > 1)
         file.Fail(offset + kPresenceOffset,
                   fmt::format("presence {}, expected -1, 0 or 1", presence));
-    }
     frame.presence = static_cast<Presence>(presence);
     file.Expect16(offset + kFrameReservedOffset, 0, "reserved field");
     frame.raw = ReadPixels(file, offset + kFrameHeadSize, geometry);
@@ -235,9 +217,8 @@ Gesture ReadFng(const std::string& path) {
     const size_t count = CheckSize(file, gesture.geometry);
     const size_t frameSize = kFrameHeadSize + PixelBytes(file, gesture.geometry);
     gesture.frames.reserve(count);
-    for (size_t i = 0; i < count; ++i) {
+    for (size_t i = 0; i < count; ++i)
         gesture.frames.push_back(ReadFrame(file, kHeaderSize + i * frameSize, gesture.geometry));
-    }
     return gesture;
 }
 

@@ -37,10 +37,9 @@ class CsvLine {
     CsvLine(const std::string& path, size_t line, const std::vector<std::string>& columns,
             const std::string& text)
         : m_path(path), m_line(line), m_columns(columns), m_fields(Split(text, ',')) {
-        if (m_fields.size() != columns.size()) {
+        if (m_fields.size() != columns.size())
             Fail(fmt::format("{} fields, expected {} as in line 1", m_fields.size(),
                              columns.size()));
-        }
     }
 
     std::string Optional(std::string_view column) const {
@@ -51,9 +50,8 @@ class CsvLine {
 
     std::string Required(std::string_view column) const {
         std::string field = Optional(column);
-        if (field.empty()) {
+        if (field.empty())
             Fail(fmt::format("{} is empty, expected a value", column));
-        }
         return field;
     }
 
@@ -70,67 +68,57 @@ class CsvLine {
 
 int32_t KeyOf(const CsvLine& line, const std::string& name, const char* column) {
     const std::optional<int32_t> key = ParseKey(name);
-    if (!key) {
+    if (!key)
         line.Fail(
             fmt::format("{} '{}', expected NONE, UP, DOWN, RIGHT, LEFT or NO_MOVE", column, name));
-    }
     return *key;
 }
 
 void ReadKeys(const CsvLine& line, FngIndexRow& row) {
     const std::string expect = line.Optional("expect");
-    if (!expect.empty()) {
+    if (!expect.empty())
         row.expect = KeyOf(line, expect, "expect");
-    }
-    for (const std::string& name : Split(line.Required("accept"), ' ')) {
+    for (const std::string& name : Split(line.Required("accept"), ' '))
         row.accept.push_back(KeyOf(line, name, "accept"));
-    }
     if (row.expect &&
-        std::find(row.accept.begin(), row.accept.end(), *row.expect) == row.accept.end()) {
+        std::find(row.accept.begin(), row.accept.end(), *row.expect) == row.accept.end())
         line.Fail(fmt::format("accept has no {}, expected it to hold the expect key", expect));
-    }
 }
 
 size_t CountOf(const CsvLine& line, const std::string& text) {
     size_t count = 0;
     const auto result = std::from_chars(text.data(), text.data() + text.size(), count);
-    if (result.ec != std::errc() || result.ptr != text.data() + text.size()) {
+    if (result.ec != std::errc() || result.ptr != text.data() + text.size())
         line.Fail(fmt::format("frames '{}', expected a count", text));
-    }
     return count;
 }
 
 FngIndexRow RowOf(const CsvLine& line) {
     FngIndexRow row;
     row.tier = line.Required("tier");
-    if (row.tier != "core" && row.tier != "hard") {
+    if (row.tier != "core" && row.tier != "hard")
         line.Fail(fmt::format("tier '{}', expected core or hard", row.tier));
-    }
     const std::string mode = line.Required("mode");
     const std::optional<Mode> knownMode = ParseMode(mode);
-    if (!knownMode) {
+    if (!knownMode)
         line.Fail(fmt::format("mode '{}', expected fp, hg or ds", mode));
-    }
     row.mode = *knownMode;
     const std::string layout = line.Required("layout");
-    if (layout != "plain" && layout != "tiled") {
+    if (layout != "plain" && layout != "tiled")
         line.Fail(fmt::format("layout '{}', expected plain or tiled", layout));
-    }
     row.tiled = layout == "tiled";
     row.kind = line.Required("kind");
     ReadKeys(line, row);
     const std::string end = line.Required("end");
     const std::optional<GestureEnd> knownEnd = ParseEnd(end);
-    if (!knownEnd) {
+    if (!knownEnd)
         line.Fail(fmt::format("end '{}', expected lift or timeout", end));
-    }
     row.end = *knownEnd;
     row.source = line.Optional("source");
     row.quality = line.Optional("quality");
     const std::string frames = line.Optional("frames");
-    if (!frames.empty()) {
+    if (!frames.empty())
         row.frames = CountOf(line, frames);
-    }
     return row;
 }
 
@@ -138,13 +126,11 @@ std::vector<std::string> LinesOf(const std::string& path) {
     const std::vector<uint8_t> bytes = ReadWholeFile(path);
     std::vector<std::string> lines =
         Split(std::string_view(reinterpret_cast<const char*>(bytes.data()), bytes.size()), '\n');
-    if (lines.back().empty()) {
+    if (lines.back().empty())
         lines.pop_back();
-    }
     for (std::string& line : lines) {
-        if (!line.empty() && line.back() == '\r') {
+        if (!line.empty() && line.back() == '\r')
             line.pop_back();
-        }
     }
     return lines;
 }
@@ -154,16 +140,13 @@ std::vector<std::string> FngFilesOf(const std::string& directory) {
     std::error_code error;
     for (std::filesystem::directory_iterator entry(directory, error), end; !error && entry != end;
          entry.increment(error)) {
-        if (entry->path().extension() == kExtension) {
+        if (entry->path().extension() == kExtension)
             files.push_back(entry->path().string());
-        }
     }
-    if (error) {
+    if (error)
         throw Error(directory, "", "cannot be listed: " + error.message());
-    }
-    if (files.empty()) {
+    if (files.empty())
         throw Error(directory, "", "has no .fng files, expected at least one");
-    }
     std::sort(files.begin(), files.end());
     return files;
 }
@@ -175,9 +158,8 @@ std::map<std::string, FngIndexRow> ReadFngIndex(const std::string& path) {
     const std::vector<std::string> columns =
         Split(lines.empty() ? std::string_view() : std::string_view(lines[0]), ',');
     for (const char* name : {"id", "tier", "mode", "layout", "kind", "expect", "accept", "end"}) {
-        if (std::count(columns.begin(), columns.end(), name) != 1) {
+        if (std::count(columns.begin(), columns.end(), name) != 1)
             throw Error(path, "1", fmt::format("expected one column {}", name));
-        }
     }
     std::map<std::string, FngIndexRow> rows;
     for (size_t i = 1; i < lines.size(); ++i) {
@@ -186,21 +168,19 @@ std::map<std::string, FngIndexRow> ReadFngIndex(const std::string& path) {
         FngIndexRow row = RowOf(line);
         row.line = i + 1;
         const auto [former, isNew] = rows.emplace(id, std::move(row));
-        if (!isNew) {
+        if (!isNew)
             line.Fail(fmt::format("id '{}' is in line {} already, expected it once", id,
                                   former->second.line));
-        }
     }
     return rows;
 }
 
 void ApplyFngIndex(const FngIndexRow& row, const std::string& indexPath, Gesture& gesture) {
     const auto check = [&](bool same, const char* column) {
-        if (!same) {
+        if (!same)
             throw Error(indexPath, std::to_string(row.line),
                         fmt::format("{} of '{}' differs from the header of its .fng file", column,
                                     gesture.id));
-        }
     };
     check(row.mode == gesture.mode, "mode");
     const char* const layout = row.tiled ? "tiled" : "plain";
@@ -212,12 +192,10 @@ void ApplyFngIndex(const FngIndexRow& row, const std::string& indexPath, Gesture
     gesture.accepted = row.accept;
     gesture.tier = row.tier;
     gesture.tags.push_back(row.kind);
-    if (!row.source.empty()) {
+    if (!row.source.empty())
         gesture.tags.push_back("source:" + row.source);
-    }
-    if (!row.quality.empty()) {
+    if (!row.quality.empty())
         gesture.tags.push_back("quality:" + row.quality);
-    }
 }
 
 void ImportFng(const std::string& path, const std::function<void(Gesture&&)>& visit) {
@@ -230,15 +208,13 @@ void ImportFng(const std::string& path, const std::function<void(Gesture&&)>& vi
     const std::string indexPath = (directory / kIndexName).string();
     std::map<std::string, FngIndexRow> rows;
     // One that is there and cannot be read is an error, a link to nowhere too.
-    if (std::filesystem::exists(std::filesystem::symlink_status(indexPath, error))) {
+    if (std::filesystem::exists(std::filesystem::symlink_status(indexPath, error)))
         rows = ReadFngIndex(indexPath);
-    }
     for (const std::string& file : files) {
         Gesture gesture = ReadFng(file);
         const auto row = rows.find(gesture.id);
-        if (row != rows.end()) {
+        if (row != rows.end())
             ApplyFngIndex(row->second, indexPath, gesture);
-        }
         visit(std::move(gesture));
     }
 }

@@ -14,9 +14,8 @@ class Crc {
   public:
     void Number(int64_t value) {
         uint8_t bytes[8];  // lowest first
-        for (int i = 0; i < 8; ++i) {
+        for (int i = 0; i < 8; ++i)
             bytes[i] = static_cast<uint8_t>(static_cast<uint64_t>(value) >> 8 * i);
-        }
         m_crc = crc32_z(m_crc, bytes, sizeof bytes);
     }
     template <typename T>
@@ -42,9 +41,8 @@ class Crc {
 uint32_t GestureChecksum(const Gesture& gesture) {
     Crc crc;
     crc.Sequence(gesture.id);
-    for (const int32_t value : gesture.params) {
+    for (const int32_t value : gesture.params)
         crc.Number(value);
-    }
     // Mode and geometry follow from the parameters, which every reader checks.
     crc.Number(static_cast<int64_t>(gesture.frames.size()));
     for (const RecordedFrame& frame : gesture.frames) {
@@ -58,14 +56,12 @@ uint32_t GestureChecksum(const Gesture& gesture) {
     crc.Number(static_cast<int64_t>(gesture.end));
     crc.Optional(gesture.label);
     crc.Number(static_cast<int64_t>(gesture.accepted.size()));
-    for (const int32_t key : gesture.accepted) {
+    for (const int32_t key : gesture.accepted)
         crc.Number(key);
-    }
     crc.Sequence(gesture.tier);
     crc.Number(static_cast<int64_t>(gesture.tags.size()));
-    for (const std::string& tag : gesture.tags) {
+    for (const std::string& tag : gesture.tags)
         crc.Sequence(tag);
-    }
     crc.Sequence(gesture.libraryVersion);
     crc.Sequence(gesture.notes);
     return crc.Get();

@@ -16,14 +16,12 @@ constexpr std::array<std::string_view, 3> kModeNames = {"fp", "hg", "ds"};
 constexpr std::array<std::string_view, 2> kEndNames = {"lift", "timeout"};
 
 bool EqualInAnyCase(std::string_view a, std::string_view b) {
-    if (a.size() != b.size()) {
+    if (a.size() != b.size())
         return false;
-    }
     for (size_t i = 0; i < a.size(); ++i) {
         if (std::toupper(static_cast<unsigned char>(a[i])) !=
-            std::toupper(static_cast<unsigned char>(b[i]))) {
+            std::toupper(static_cast<unsigned char>(b[i])))
             return false;
-        }
     }
     return true;
 }
@@ -31,18 +29,16 @@ bool EqualInAnyCase(std::string_view a, std::string_view b) {
 template <size_t N>
 std::optional<int32_t> Find(const std::array<std::string_view, N>& names, std::string_view name) {
     for (size_t i = 0; i < N; ++i) {
-        if (EqualInAnyCase(names[i], name)) {
+        if (EqualInAnyCase(names[i], name))
             return static_cast<int32_t>(i);
-        }
     }
     return std::nullopt;
 }
 
 template <size_t N>
 std::string NameAt(const std::array<std::string_view, N>& names, int32_t value) {
-    if (value < 0 || value >= static_cast<int32_t>(N)) {
+    if (value < 0 || value >= static_cast<int32_t>(N))
         return std::to_string(value);
-    }
     return std::string(names[static_cast<size_t>(value)]);
 }
 
@@ -71,9 +67,8 @@ std::optional<Mode> ParseMode(std::string_view name) {
 
 Mode ModeOf(const ParamBlock& params) {
     const int32_t flag = ParamValue(params, "s_modeFlag");
-    if (flag == static_cast<int32_t>(Mode::Hg)) {
+    if (flag == static_cast<int32_t>(Mode::Hg))
         return Mode::Hg;
-    }
     return flag == static_cast<int32_t>(Mode::DoubleScan) ? Mode::DoubleScan : Mode::Fp;
 }
 

@@ -32,18 +32,16 @@ bool IsBand(std::string_view name) {
 
 int32_t IntegerOf(const toml::node& node, const std::string& name, const std::string& file) {
     const toml::value<int64_t>* const integer = node.as_integer();
-    if (integer == nullptr) {
+    if (integer == nullptr)
         throw ErrorAt(
             file, node.source().begin,
             fmt::format("{} is of type {}, expected an integer", name, TypeText(node.type())));
-    }
     constexpr int64_t kMin = std::numeric_limits<int32_t>::min();
     constexpr int64_t kMax = std::numeric_limits<int32_t>::max();
-    if (integer->get() < kMin || integer->get() > kMax) {
+    if (integer->get() < kMin || integer->get() > kMax)
         throw ErrorAt(file, node.source().begin,
                       fmt::format("{} = {} is out of range, expected {} to {}", name,
                                   integer->get(), kMin, kMax));
-    }
     return static_cast<int32_t>(integer->get());
 }
 
@@ -52,12 +50,11 @@ void ReadBand(const toml::table& band, const std::string& bandName, const std::s
     for (const auto& [key, node] : band) {
         const std::string name = fmt::format("{}.{}", bandName, key.str());
         const std::optional<size_t> index = ParamIndex(name);
-        if (!index) {
+        if (!index)
             throw ErrorAt(file, key.source().begin,
                           fmt::format("unknown parameter {}, expected {}.RANGE_LOW or "
                                       "{}.RANGE_HIGH",
                                       name, bandName, bandName));
-        }
         params[*index] = IntegerOf(node, name, file);
     }
 }
@@ -67,23 +64,21 @@ void ReadTable(const toml::table& table, const std::string& file, ParamBlock& pa
         const std::string name(key.str());
         if (IsBand(name)) {
             const toml::table* const band = node.as_table();
-            if (band == nullptr) {
+            if (band == nullptr)
                 throw ErrorAt(file, node.source().begin,
                               fmt::format("{} is of type {}, expected {}.RANGE_LOW and "
                                           "{}.RANGE_HIGH",
                                           name, TypeText(node.type()), name, name));
-            }
             ReadBand(*band, name, file, params);
             continue;
         }
         // A quoted key with a dot would be a second spelling of a band's half.
         const std::optional<size_t> index = ParamIndex(name);
-        if (!index || name.find('.') != std::string::npos) {
+        if (!index || name.find('.') != std::string::npos)
             throw ErrorAt(file, key.source().begin,
                           fmt::format("unknown parameter {}, expected a name of the parameter "
                                       "block",
                                       name));
-        }
         params[*index] = IntegerOf(node, name, file);
     }
 }
@@ -114,9 +109,8 @@ std::string ParamFileText(const ParamBlock& params) {
     for (size_t i = 0; i < params.size(); ++i) {
         const ParamInfo& info = ParamTable()[i];
         text += fmt::format("{} = {}", info.name, params[i]);
-        if (params[i] != info.defaultValue) {
+        if (params[i] != info.defaultValue)
             text += fmt::format("  # default {}", info.defaultValue);
-        }
         text += '\n';
     }
     return text;

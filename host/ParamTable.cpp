@@ -154,9 +154,8 @@ static_assert(kTable.back().name != nullptr, "the table names every parameter");
 const std::unordered_map<std::string_view, size_t>& IndexByName() {
     static const std::unordered_map<std::string_view, size_t> index = [] {
         std::unordered_map<std::string_view, size_t> map;
-        for (size_t i = 0; i < kTable.size(); ++i) {
+        for (size_t i = 0; i < kTable.size(); ++i)
             map.emplace(kTable[i].name, i);
-        }
         return map;
     }();
     return index;
@@ -176,17 +175,15 @@ const std::array<ParamInfo, FPNAVI_PARAM_NUM>& ParamTable() {
 
 std::optional<size_t> ParamIndex(std::string_view name) {
     const auto found = IndexByName().find(name);
-    if (found == IndexByName().end()) {
+    if (found == IndexByName().end())
         return std::nullopt;
-    }
     return found->second;
 }
 
 ParamBlock DefaultParams() {
     ParamBlock params{};
-    for (size_t i = 0; i < kTable.size(); ++i) {
+    for (size_t i = 0; i < kTable.size(); ++i)
         params[i] = kTable[i].defaultValue;
-    }
     return params;
 }
 
@@ -199,10 +196,9 @@ int32_t ParamValue(const ParamBlock& params, std::string_view name) {
 }
 
 Geometry GeometryOf(const ParamBlock& params) {
-    if (ParamValue(params, "s_modeFlag") == static_cast<int32_t>(Mode::Hg)) {
+    if (ParamValue(params, "s_modeFlag") == static_cast<int32_t>(Mode::Hg))
         return {ParamValue(params, "s_blockWidthHg"), ParamValue(params, "s_blockHeightHg"),
                 ParamValue(params, "s_blockColNumHg"), ParamValue(params, "s_blockRowNumHg")};
-    }
     return {ParamValue(params, "s_blockWidthFp"), ParamValue(params, "s_blockHeightFp"),
             ParamValue(params, "s_blockColNumFp"), ParamValue(params, "s_blockRowNumFp")};
 }

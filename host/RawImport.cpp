@@ -24,15 +24,13 @@ void ReadFrames(const RawRecording& recording, Gesture& gesture) {
     const auto frameSize = static_cast<size_t>(g.Width() * g.Height());
     const std::string expected = fmt::format("frames of {} bytes ({} x {}, mode {})", frameSize,
                                              g.Width(), g.Height(), ModeName(gesture.mode));
-    if (bytes.empty()) {
+    if (bytes.empty())
         throw Error(recording.framesPath, "", "the file is empty, expected " + expected);
-    }
     const size_t remainder = bytes.size() % frameSize;
-    if (remainder != 0) {
+    if (remainder != 0)
         throw Error(recording.framesPath, fmt::format("byte {}", bytes.size() - remainder),
                     fmt::format("a remainder of {} bytes after {} frames, expected {}", remainder,
                                 bytes.size() / frameSize, expected));
-    }
     for (auto start = bytes.begin(); start != bytes.end();) {
         const auto end = start + static_cast<std::ptrdiff_t>(frameSize);
         RecordedFrame frame;
@@ -44,24 +42,20 @@ void ReadFrames(const RawRecording& recording, Gesture& gesture) {
 
 void ReadRegisters(const RawRecording& recording, Gesture& gesture) {
     const std::string& path = recording.registersPath;
-    if (path.empty() && gesture.mode == Mode::DoubleScan) {
+    if (path.empty() && gesture.mode == Mode::DoubleScan)
         throw Error(recording.framesPath, "", "mode ds without a file of registers, expected one");
-    }
-    if (path.empty()) {
+    if (path.empty())
         return;
-    }
-    if (gesture.mode != Mode::DoubleScan) {
+    if (gesture.mode != Mode::DoubleScan)
         throw Error(path, "",
                     fmt::format("registers in mode {}, expected them in mode ds only",
                                 ModeName(gesture.mode)));
-    }
     const std::vector<uint8_t> bytes = ReadWholeFile(path);
     const size_t expected = gesture.frames.size() * kRegisterBytes;
-    if (bytes.size() != expected) {
+    if (bytes.size() != expected)
         throw Error(path, fmt::format("byte {}", std::min(bytes.size(), expected)),
                     fmt::format("{} bytes, expected {} ({} for each of {} frames)", bytes.size(),
                                 expected, kRegisterBytes, gesture.frames.size()));
-    }
     const uint8_t* entry = bytes.data();
     for (RecordedFrame& frame : gesture.frames) {
         frame.reg24 = ReadLe32(entry);
@@ -82,9 +76,8 @@ Gesture ImportRaw(const RawRecording& recording) {
     gesture.geometry = GeometryOf(gesture.params);
     gesture.end = recording.end;
     gesture.label = recording.label;
-    if (recording.label) {
+    if (recording.label)
         gesture.accepted = {*recording.label};
-    }
     gesture.libraryVersion = recording.libraryVersion;
     gesture.notes = "imported from " + path.filename().string();
     CheckGesture(gesture, recording.framesPath);

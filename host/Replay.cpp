@@ -9,6 +9,7 @@
 #include "ParamTable.h"
 #include "Store.h"
 #include "gesture/NaviVoteInfo.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace host {
@@ -43,7 +44,7 @@ class Loop {
 
     void Run(ReplayResult* result) {
         if (SetNaviParam(m_gesture.params.data()) != 0)
-            result->errors.push_back("SetNaviParam returned -1");
+            result->errors.emplace_back("SetNaviParam returned -1");
         FpNaviClear();
         bool seen = false;
         bool left = false;
@@ -60,7 +61,7 @@ class Loop {
         result->pairs = fpnavi::s_voteInfo.calc_cnt;
         result->key = Voting(result->voteTimeOut);
         if (result->key < 0)
-            result->errors.push_back("Voting returned -1");
+            result->errors.emplace_back("Voting returned -1");
     }
 
   private:
@@ -107,7 +108,7 @@ ReplayResult ReplayHere(const Gesture& gesture, const ReplayHooks& hooks,
                         const std::string& source) {
     CheckGesture(gesture, source);
     CheckFingerTestSize(gesture, source);
-    if (fpnavi::s_doubleScanFlag == 1 && gesture.mode != Mode::DoubleScan)
+    if (fpnavi::ScansTwice() && gesture.mode != Mode::DoubleScan)
         Refuse(gesture, source,
                fmt::format("this process has switched the double scan on; a gesture of "
                            "mode {} needs a process of its own",

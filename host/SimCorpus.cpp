@@ -23,9 +23,8 @@ SimPlan CorpusPlan(uint64_t seed, int64_t index) {
 
 Gesture SimulateCorpusGesture(uint64_t seed, int64_t index) {
     std::string digits = std::to_string(index);
-    if (digits.size() < kIndexDigits) {
+    if (digits.size() < kIndexDigits)
         digits.insert(0, kIndexDigits - digits.size(), '0');
-    }
     return Simulate(CorpusPlan(seed, index), "sim-" + std::to_string(seed) + "-" + digits);
 }
 

@@ -76,17 +76,15 @@ SensorWindow SensorWindow::Of(const ParamBlock& params) {
 int32_t ContactAt(const ContactPatch& patch, int32_t pressure, int32_t x16, int32_t y16) {
     const int32_t semiX = PressedAxis(patch.semiX16, pressure);
     const int32_t semiY = PressedAxis(patch.semiY16, pressure);
-    if (semiX < 1 || semiY < 1) {
+    if (semiX < 1 || semiY < 1)
         return 0;
-    }
     // Radius in 1/1024 of the ellipse; far outside needs no root.
     const int64_t x = static_cast<int64_t>(x16) * 1024 / semiX;
     const int64_t y = static_cast<int64_t>(y16) * 1024 / semiY;
     const int64_t square = x * x + y * y;
     constexpr int64_t kFar = 1300 * 1300;
-    if (square > kFar) {
+    if (square > kFar)
         return 0;
-    }
     const auto radius = static_cast<int32_t>(SquareRoot(static_cast<uint64_t>(square)));
     const int32_t semi = semiX < semiY ? semiX : semiY;
     // The edge wanders by up to an eighth of its own width and a twentieth of the radius.
@@ -175,9 +173,8 @@ ZoneRegisters SenseZones(const ContactPatch& patch, const FingerState& finger,
         for (int32_t column = 0; column < kZones; ++column) {
             const int32_t contact = ZoneContact(patch, finger, window, column, row);
             bool covered = contact > 127;
-            if (contact > 90 && contact < 165 && random.Chance(kFlipPercent)) {
+            if (contact > 90 && contact < 165 && random.Chance(kFlipPercent))
                 covered = !covered;
-            }
             const int32_t bit = 31 - 8 * (row % 4) - column;
             (row < 4 ? registers.reg28 : registers.reg24) |= (covered ? 1U : 0U) << bit;
         }

@@ -86,9 +86,8 @@ FrontEndPlan RandomFrontEnd(uint64_t seed) {
 
 uint32_t StartRegister(const FrontEndPlan& plan) {
     const int32_t dc = ClampTo(plan.startDc, 0, 255);
-    if (plan.layout != 0) {
+    if (plan.layout != 0)
         return (plan.startBits & ~0xFFU) | static_cast<uint32_t>(dc);
-    }
     return (BytePair(dc, plan.startBits >> 16) << 16) | BytePair(dc, plan.startBits);
 }
 
@@ -138,9 +137,8 @@ std::vector<uint8_t> FrontEnd::Picture(int32_t dc) {
 std::vector<uint8_t> FrontEnd::Grab(uint32_t dac) {
     m_drift16 = ClampTo(m_drift16 + m_random.Range(-m_plan.drift16, m_plan.drift16),
                         -kGreatestDrift16, kGreatestDrift16);
-    if (m_plan.layout != 0) {
+    if (m_plan.layout != 0)
         return ToBlockOrder(Picture(Byte(dac, 0)), m_geometry);
-    }
     const int32_t even = Byte(dac, 1) - Byte(dac, 0);
     const int32_t odd = Byte(dac, 3) - Byte(dac, 2);
     std::vector<uint8_t> picture = Picture(even);
@@ -148,9 +146,8 @@ std::vector<uint8_t> FrontEnd::Grab(uint32_t dac) {
         const std::vector<uint8_t> other = Picture(odd);
         const auto width = static_cast<size_t>(m_geometry.Width());
         for (size_t i = 0; i < picture.size(); ++i) {
-            if (i % width % 2 == 1) {
+            if (i % width % 2 == 1)
                 picture[i] = other[i];
-            }
         }
     }
     return ToBlockOrder(picture, m_geometry);

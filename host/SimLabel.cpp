@@ -54,9 +54,8 @@ bool AlongAxis(int32_t x, int32_t y) {
 }
 
 int32_t KeyOfTravel(int32_t x, int32_t y) {
-    if (Abs(x) > Abs(y)) {
+    if (Abs(x) > Abs(y))
         return x > 0 ? VKEY_RIGHT : VKEY_LEFT;
-    }
     return y > 0 ? VKEY_DOWN : VKEY_UP;
 }
 
@@ -66,17 +65,15 @@ bool IsPlainRidgeMotion(const std::vector<FrameTruth>& frames, int32_t key) {
     int32_t x = 0;
     int32_t y = 0;
     for (size_t i = 1; i < frames.size(); ++i) {
-        if (frames[i - 1].share < kGoodShare || frames[i].share < kGoodShare) {
+        if (frames[i - 1].share < kGoodShare || frames[i].share < kGoodShare)
             continue;
-        }
         const int32_t dx = frames[i].finger.x16 - frames[i - 1].finger.x16;
         const int32_t dy = frames[i].finger.y16 - frames[i - 1].finger.y16;
         x += dx;
         y += dy;
         const int32_t step = Abs(dx) > Abs(dy) ? Abs(dx) : Abs(dy);
-        if (step > kGreatestStep16) {
+        if (step > kGreatestStep16)
             return false;
-        }
         pairs += step >= kLeastStep16 ? 1 : 0;
     }
     const int32_t travel = Abs(x) > Abs(y) ? Abs(x) : Abs(y);
@@ -106,9 +103,8 @@ bool IsPlainBlobMotion(const std::vector<FrameTruth>& frames, int32_t key) {
             last = &frame;
         }
     }
-    if (first == nullptr) {
+    if (first == nullptr)
         return false;
-    }
     const int32_t x = last->blobX16 - first->blobX16;
     const int32_t y = last->blobY16 - first->blobY16;
     const int32_t travel = Abs(x) > Abs(y) ? Abs(x) : Abs(y);
@@ -118,12 +114,10 @@ bool IsPlainBlobMotion(const std::vector<FrameTruth>& frames, int32_t key) {
 bool IsPlainMotion(const SimPlan& plan, const std::vector<FrameTruth>& frames, int32_t key,
                    int32_t crossing) {
     if (plan.kind != SimKind::Stroke || plan.skin == SkinState::Wet ||
-        !IsUnbroken(frames, plan.mode)) {
+        !IsUnbroken(frames, plan.mode))
         return false;
-    }
-    if (plan.mode == Mode::Hg) {
+    if (plan.mode == Mode::Hg)
         return IsPlainBlobMotion(frames, key);
-    }
     // What changes from frame to frame grows with the step and with the gradient along it.
     return crossing >= kLeastCrossing && crossing * (plan.speed16 - kRestStep16) >= kLeastChange &&
            IsPlainRidgeMotion(frames, key);
@@ -132,9 +126,8 @@ bool IsPlainMotion(const SimPlan& plan, const std::vector<FrameTruth>& frames, i
 // The second direction of a diagonal.
 int32_t SideKey(int32_t degrees, int32_t key) {
     const bool horizontal = key == VKEY_RIGHT || key == VKEY_LEFT;
-    if (horizontal) {
+    if (horizontal)
         return degrees < 180 ? VKEY_UP : VKEY_DOWN;
-    }
     return degrees < 90 || degrees > 270 ? VKEY_RIGHT : VKEY_LEFT;
 }
 
@@ -171,18 +164,16 @@ void MeasureContact(const std::vector<SkinPoint>& points, int32_t width, FrameTr
     truth.touched = truth.touched || sum > 0;
     truth.share = sum / 255 * 100 / count;
     int32_t most = 0;
-    for (const int32_t quadrant : quadrants) {
+    for (const int32_t quadrant : quadrants)
         most = quadrant > most ? quadrant : most;
-    }
     truth.quadrantShare = most / 255 * 400 / count;
     truth.blobX16 = sum == 0 ? 0 : static_cast<int32_t>(x * kSubPixels / sum);
     truth.blobY16 = sum == 0 ? 0 : static_cast<int32_t>(y * kSubPixels / sum);
 }
 
 Presence PresenceOf(const FrameTruth& truth, Mode mode) {
-    if (!truth.touched) {
+    if (!truth.touched)
         return Presence::Absent;
-    }
     bool present = false;
     switch (mode) {
         case Mode::Fp:
@@ -214,16 +205,13 @@ Answers JudgeGesture(const SimPlan& plan, const std::vector<FrameTruth>& frames,
         return answers;
     }
     const int32_t key = KeyOfAngle(plan.angle);
-    if (plan.kind == SimKind::Diagonal) {
+    if (plan.kind == SimKind::Diagonal)
         return JudgeTwoKeys(plan.kind, key, SideKey((plan.angle % 360 + 360) % 360, key));
-    }
-    if (plan.kind == SimKind::Reversal) {
+    if (plan.kind == SimKind::Reversal)
         return JudgeTwoKeys(plan.kind, key, OppositeKey(key));
-    }
     answers.kindTag = std::string(SimKindName(plan.kind)) + ":" + KeyName(key);
-    if (plan.kind != SimKind::Small) {
+    if (plan.kind != SimKind::Small)
         answers.label = key;
-    }
     if (IsPlainMotion(plan, frames, key, crossing)) {
         answers.tier = "core";
         answers.accepted = {key};

@@ -32,9 +32,8 @@ constexpr std::array<int32_t, 65> kAtanTable = {
 int32_t Interpolate(const std::array<int32_t, 65>& table, int32_t position, int32_t step) {
     const auto index = static_cast<size_t>(position / step);
     const int32_t rest = position % step;
-    if (rest == 0) {
+    if (rest == 0)
         return table[index];
-    }
     return table[index] + (table[index + 1] - table[index]) * rest / step;
 }
 
@@ -57,8 +56,8 @@ uint64_t Mix64(uint64_t key) {
 }
 
 uint64_t SimRandom::Next() {
-    state_ += kGoldenStep;
-    return Mix64(state_);
+    m_state += kGoldenStep;
+    return Mix64(m_state);
 }
 
 int32_t SimRandom::Below(int32_t count) {
@@ -102,9 +101,8 @@ int32_t Cos(uint32_t angle) {
 uint32_t Atan2(int32_t y, int32_t x) {
     const int32_t absX = x < 0 ? -x : x;
     const int32_t absY = y < 0 ? -y : y;
-    if (absX == 0 && absY == 0) {
+    if (absX == 0 && absY == 0)
         return 0;
-    }
     const bool steep = absY > absX;
     // The ratio of the smaller to the larger side in 1/4096; 2^18 * 2^12 fits 31 bits.
     const int32_t ratio = steep ? absX * 4096 / absY : absY * 4096 / absX;
@@ -122,9 +120,8 @@ uint32_t AngleOfDegrees(int32_t degrees) {
 uint32_t SquareRoot(uint64_t value) {
     uint64_t root = 0;
     uint64_t bit = 1ULL << 62;
-    while (bit > value) {
+    while (bit > value)
         bit >>= 2;
-    }
     for (; bit != 0; bit >>= 2) {
         if (value >= root + bit) {
             value -= root + bit;

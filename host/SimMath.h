@@ -21,7 +21,7 @@ uint64_t Mix64(uint64_t key);
 // Pseudo-random numbers from a 64-bit seed: a counter that is mixed.
 class SimRandom {
   public:
-    explicit SimRandom(uint64_t seed) : state_(seed) {}
+    explicit SimRandom(uint64_t seed) : m_state(seed) {}
 
     uint64_t Next();
 
@@ -38,7 +38,7 @@ class SimRandom {
     int32_t Noise(int32_t deviation16);
 
   private:
-    uint64_t state_;
+    uint64_t m_state;
 };
 
 // -kSinOne .. kSinOne; angle in 1/65536 turn, any value.

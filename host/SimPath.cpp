@@ -14,21 +14,18 @@ struct Step {
 // The finger lands at half its speed and leaves at full speed.
 std::vector<Step> Profile(const SimPlan& plan) {
     std::vector<Step> steps(static_cast<size_t>(plan.lead));
-    for (int32_t i = 1; i <= plan.land; ++i) {
+    for (int32_t i = 1; i <= plan.land; ++i)
         steps.push_back({i == 1 ? 0 : 128, plan.pressure * i / (plan.land + 1)});
-    }
     for (int32_t i = 0; i < plan.frames; ++i) {
         const bool back = plan.kind == SimKind::Reversal && i >= plan.frames / 2;
         const bool turning = plan.kind == SimKind::Reversal && i == plan.frames / 2;
         steps.push_back({turning ? 0 : (back ? -256 : 256), plan.pressure});
     }
-    if (plan.timeOut) {
+    if (plan.timeOut)
         return steps;
-    }
     const int32_t last = plan.kind == SimKind::Reversal ? -256 : 256;
-    for (int32_t i = plan.lift; i >= 1; --i) {
+    for (int32_t i = plan.lift; i >= 1; --i)
         steps.push_back({last, plan.pressure * i / (plan.lift + 1)});
-    }
     steps.insert(steps.end(), static_cast<size_t>(plan.tail), Step{});
     return steps;
 }
@@ -44,9 +41,8 @@ void Centre(std::vector<FingerState>& path, int32_t jitter16, SimRandom& random)
             last = &state;
         }
     }
-    if (first == nullptr) {
+    if (first == nullptr)
         return;
-    }
     const int32_t moveX = random.Range(-jitter16, jitter16) - (first->x16 + last->x16) / 2;
     const int32_t moveY = random.Range(-jitter16, jitter16) - (first->y16 + last->y16) / 2;
     for (FingerState& state : path) {

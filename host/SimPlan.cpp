@@ -30,9 +30,8 @@ SimKind DrawKind(SimRandom& random) {
     int32_t left = random.Below(100);
     for (const KindShare& share : kMixture) {
         left -= share.percent;
-        if (left < 0) {
+        if (left < 0)
             return share.kind;
-        }
     }
     return SimKind::Stroke;
 }

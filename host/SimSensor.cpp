@@ -28,9 +28,8 @@ void AddSeenGradient(Skin& skin, const ContactPatch& patch, const FingerState& f
         for (int32_t x = 0; x < window.width; x += kGradientStep) {
             const int32_t x16 = (2 * x + 1 - window.width) * 8 - finger.x16;
             const int32_t y16 = (2 * y + 1 - window.height) * 8 - finger.y16;
-            if (ContactAt(patch, finger.pressure, x16, y16) > 127) {
+            if (ContactAt(patch, finger.pressure, x16, y16) > 127)
                 skin.AddGradient(x16, y16, sum);
-            }
         }
     }
 }
@@ -51,9 +50,8 @@ int32_t Crossing(const SimPlan& plan, const SkinGradient& sum) {
 
 int32_t CountBits(uint32_t bits) {
     int32_t count = 0;
-    for (; bits != 0; bits &= bits - 1) {
+    for (; bits != 0; bits &= bits - 1)
         ++count;
-    }
     return count;
 }
 
@@ -85,9 +83,8 @@ GreyModel GreyModelOf(const SimPlan& plan) {
     model.ridge = hg ? random.Range(15, 45) : random.Range(35, 80);
     model.valley = hg ? random.Range(80, 125) : random.Range(165, 215);
     model.gain256 = random.Range(235, 270);
-    if (plan.skin == SkinState::Wet) {
+    if (plan.skin == SkinState::Wet)
         model.valley = model.ridge + (model.valley - model.ridge) * random.Range(35, 60) / 100;
-    }
     model.pattern = random.Range(1, 4);
     model.noise16 = plan.noise16;
     model.patternSeed = random.Next();
@@ -141,9 +138,8 @@ Gesture Simulate(const SimPlan& plan, std::string id) {
     gesture.accepted = std::move(answers.accepted);
     gesture.tier = std::move(answers.tier);
     gesture.tags = {"simulated", std::move(answers.kindTag), plan.plain ? "plain" : "tiled"};
-    if (plan.skin != SkinState::Normal) {
+    if (plan.skin != SkinState::Normal)
         gesture.tags.emplace_back(plan.skin == SkinState::Wet ? "wet" : "dry");
-    }
     gesture.notes = NoteOf(plan);
     return gesture;
 }

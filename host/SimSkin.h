@@ -53,17 +53,17 @@ class Skin {
     uint32_t RidgePhase(int32_t x, int32_t y) const;
     int32_t CoreDistance16(int32_t x16, int32_t y16) const;
 
-    SkinShape shape_;
-    std::array<uint64_t, 7> layerSeeds_{};  // of the noise layers
-    int32_t coreX16_;
-    int32_t coreY16_;
-    int32_t coreLength16_;  // the core is a line; ridges run around it
-    uint32_t coreAxis_;
-    int32_t blotch_;  // strength of the irregularities of 8 and of 4 pixels, in 1/64
-    int32_t grain_;
-    std::vector<Minutia> minutiae_;
-    std::vector<uint8_t> heights_;
-    std::vector<uint8_t> known_;
+    SkinShape m_shape;
+    std::array<uint64_t, 7> m_layerSeeds{};  // of the noise layers
+    int32_t m_coreX16;
+    int32_t m_coreY16;
+    int32_t m_coreLength16;  // the core is a line; ridges run around it
+    uint32_t m_coreAxis;
+    int32_t m_blotch;  // strength of the irregularities of 8 and of 4 pixels, in 1/64
+    int32_t m_grain;
+    std::vector<Minutia> m_minutiae;
+    std::vector<uint8_t> m_heights;
+    std::vector<uint8_t> m_known;
 };
 
 }  // namespace host

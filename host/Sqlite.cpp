@@ -33,16 +33,14 @@ Database::~Database() {
 }
 
 void Database::Execute(const char* sql, const char* doing) {
-    if (sqlite3_exec(m_handle, sql, nullptr, nullptr, nullptr) != SQLITE_OK) {
+    if (sqlite3_exec(m_handle, sql, nullptr, nullptr, nullptr) != SQLITE_OK)
         Fail(doing);
-    }
 }
 
 int64_t Database::Number(const char* sql, const char* doing) const {
     Statement statement(*this, sql, doing);
-    if (!statement.Step()) {
+    if (!statement.Step())
         throw Error(m_path, "", fmt::format("cannot {}: no answer, expected a number", doing));
-    }
     return statement.Integer(0, INT64_MIN, INT64_MAX);
 }
 
@@ -50,20 +48,17 @@ void Database::Fail(const std::string& doing) const {
     std::string reason = sqlite3_errmsg(m_handle);
     const int primary = sqlite3_errcode(m_handle) & 0xFF;
     const int systemError = sqlite3_system_errno(m_handle);
-    if ((primary == SQLITE_IOERR || primary == SQLITE_CANTOPEN) && systemError != 0) {
+    if ((primary == SQLITE_IOERR || primary == SQLITE_CANTOPEN) && systemError != 0)
         reason += fmt::format(" ({})", std::strerror(systemError));
-    }
-    if (primary == SQLITE_CORRUPT) {
+    if (primary == SQLITE_CORRUPT)
         reason += ", expected a sound SQLite file";
-    }
     throw Error(m_path, "", fmt::format("cannot {}: {}", doing, reason));
 }
 
 Statement::Statement(const Database& database, const char* sql, const char* doing)
     : m_database(database), m_doing(doing) {
-    if (sqlite3_prepare_v2(database.Handle(), sql, -1, &m_handle, nullptr) != SQLITE_OK) {
+    if (sqlite3_prepare_v2(database.Handle(), sql, -1, &m_handle, nullptr) != SQLITE_OK)
         database.Fail(doing);
-    }
 }
 
 Statement::~Statement() {
@@ -71,9 +66,8 @@ Statement::~Statement() {
 }
 
 void Statement::CheckBound(int result) const {
-    if (result != SQLITE_OK) {
+    if (result != SQLITE_OK)
         m_database.Fail(m_doing);
-    }
 }
 
 void Statement::Bind(int parameter, int64_t value) {
@@ -97,9 +91,8 @@ void Statement::BindNull(int parameter) {
 
 bool Statement::Step() {
     const int result = sqlite3_step(m_handle);
-    if (result != SQLITE_ROW && result != SQLITE_DONE) {
+    if (result != SQLITE_ROW && result != SQLITE_DONE)
         m_database.Fail(m_place.empty() ? m_doing : fmt::format("{} ({})", m_doing, m_place));
-    }
     return result == SQLITE_ROW;
 }
 
@@ -110,10 +103,9 @@ void Statement::Reset() {
 int64_t Statement::Integer(int column, int64_t lowest, int64_t highest) const {
     CheckType(column, SQLITE_INTEGER, "an integer");
     const int64_t value = sqlite3_column_int64(m_handle, column);
-    if (value < lowest || value > highest) {
+    if (value < lowest || value > highest)
         FailRow(fmt::format("{} is {}, expected {} to {}", sqlite3_column_name(m_handle, column),
                             value, lowest, highest));
-    }
     return value;
 }
 
@@ -136,10 +128,9 @@ bool Statement::IsNull(int column) const {
 }
 
 void Statement::CheckType(int column, int type, const char* expected) const {
-    if (sqlite3_column_type(m_handle, column) != type) {
+    if (sqlite3_column_type(m_handle, column) != type)
         FailRow(fmt::format("{} has the wrong type, expected {}",
                             sqlite3_column_name(m_handle, column), expected));
-    }
 }
 
 void Statement::FailRow(const std::string& problem) const {
@@ -155,11 +146,10 @@ Transaction::Transaction(Database& database, const char* doing)
 
 Transaction::~Transaction() {
     // Some failures (a full disk) have rolled back already; then there is nothing to end.
-    if (m_open && sqlite3_get_autocommit(m_database.Handle()) == 0) {
+    if (m_open && sqlite3_get_autocommit(m_database.Handle()) == 0)
         sqlite3_exec(m_database.Handle(),
                      m_nested ? "ROLLBACK TO nested; RELEASE nested" : "ROLLBACK", nullptr, nullptr,
                      nullptr);
-    }
 }
 
 void Transaction::Commit() {

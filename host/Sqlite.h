@@ -54,11 +54,10 @@ class Statement {
     void BindNull(int parameter);
     template <typename T>
     void BindOptional(int parameter, const std::optional<T>& value) {
-        if (value) {
+        if (value)
             Bind(parameter, static_cast<int64_t>(*value));
-        } else {
+        else
             BindNull(parameter);
-        }
     }
 
     // True when there is a row to read.

@@ -38,9 +38,8 @@ class DirectoryLock {
         }
     }
     ~DirectoryLock() {
-        if (m_directory >= 0) {
+        if (m_directory >= 0)
             close(m_directory);
-        }
     }
     DirectoryLock(const DirectoryLock&) = delete;
     DirectoryLock& operator=(const DirectoryLock&) = delete;
@@ -52,16 +51,14 @@ class DirectoryLock {
 void RemoveFile(const std::string& path) {
     std::error_code error;
     std::filesystem::remove(path, error);
-    if (error) {
+    if (error)
         throw Error(path, "", "cannot be deleted: " + error.message());
-    }
 }
 
 // What SQLite keeps beside a store: it would take it for the new store's.
 void RemoveCompanions(const std::string& path) {
-    for (const char* suffix : {"-wal", "-shm", "-journal"}) {
+    for (const char* suffix : {"-wal", "-shm", "-journal"})
         RemoveFile(path + suffix);
-    }
 }
 
 // Also a link to nowhere.
@@ -78,9 +75,8 @@ bool IsEmptyFile(const std::string& path) {
 
 // Folds the log of a store that is about to be replaced, so that it stays whole until then.
 void PrepareFormer(const std::string& path) {
-    if (!IsThere(path) || IsEmptyFile(path)) {
+    if (!IsThere(path) || IsEmptyFile(path))
         return;
-    }
     try {
         OpenStoreFile(path, false);
     } catch (const Error& reason) {
@@ -92,18 +88,16 @@ void PrepareFormer(const std::string& path) {
     sqlite3_busy_timeout(former.Handle(), 0);
     const int result =
         sqlite3_exec(former.Handle(), "PRAGMA journal_mode = DELETE", nullptr, nullptr, nullptr);
-    if ((result & 0xFF) == SQLITE_BUSY) {
+    if ((result & 0xFF) == SQLITE_BUSY)
         throw Error(path, "", "will not be replaced: another process has it open");
-    }
 }
 
 // An empty store in one file. Its errors name path, the file that it is to become.
 void MakeTables(const std::string& newPath, const std::string& path) {
     RemoveFile(newPath);
     std::FILE* const file = std::fopen(newPath.c_str(), "wbx");
-    if (file == nullptr) {
+    if (file == nullptr)
         FailCreating(path, errno);
-    }
     std::fclose(file);
     try {
         Database database(newPath, SQLITE_OPEN_READWRITE);
@@ -120,12 +114,10 @@ void MakeTables(const std::string& newPath, const std::string& path) {
 // Unlike rename, an error when there is a file of that name.
 int RenameToFree(const std::string& from, const std::string& to) {
 #ifdef RENAME_NOREPLACE
-    if (renameat2(AT_FDCWD, from.c_str(), AT_FDCWD, to.c_str(), RENAME_NOREPLACE) == 0) {
+    if (renameat2(AT_FDCWD, from.c_str(), AT_FDCWD, to.c_str(), RENAME_NOREPLACE) == 0)
         return 0;
-    }
-    if (errno != EINVAL && errno != ENOSYS) {
+    if (errno != EINVAL && errno != ENOSYS)
         return -1;
-    }
 #endif
     // A file system that knows no such renaming; the directory's lock keeps other creators out.
     if (access(to.c_str(), F_OK) == 0) {
@@ -140,11 +132,10 @@ int RenameToFree(const std::string& from, const std::string& to) {
 Store Store::Create(const std::string& path, IfExists ifExists) {
     {
         const DirectoryLock lock(path);
-        if (ifExists == IfExists::Replace) {
+        if (ifExists == IfExists::Replace)
             PrepareFormer(path);
-        } else if (IsThere(path)) {
+        else if (IsThere(path))
             FailCreating(path, EEXIST);
-        }
         const std::string newPath = path + kNewSuffix;
         MakeTables(newPath, path);
         RemoveCompanions(path);

@@ -38,13 +38,11 @@ constexpr const char* kReadFrames =
 std::vector<std::string> TextList(const Statement& row, int column, const char* name) {
     const nlohmann::json list = nlohmann::json::parse(row.Text(column), nullptr, false);
     std::vector<std::string> texts;
-    if (!list.is_array()) {
+    if (!list.is_array())
         row.FailRow(fmt::format("{} is no JSON list of texts", name));
-    }
     for (const nlohmann::json& entry : list) {
-        if (!entry.is_string()) {
+        if (!entry.is_string())
             row.FailRow(fmt::format("{} is no JSON list of texts", name));
-        }
         texts.push_back(entry.get<std::string>());
     }
     return texts;
@@ -52,10 +50,9 @@ std::vector<std::string> TextList(const Statement& row, int column, const char* 
 
 int32_t KeyFrom(const Statement& row, const std::string& name) {
     const std::optional<int32_t> key = ParseKey(name);
-    if (!key) {
+    if (!key)
         row.FailRow(
             fmt::format("'{}' is no key, expected NONE, UP, DOWN, RIGHT, LEFT or NO_MOVE", name));
-    }
     return *key;
 }
 
@@ -66,29 +63,24 @@ int32_t BlockSide(const Statement& row, int column) {
 void ReadNames(const Statement& row, Gesture& gesture) {
     const std::string mode = row.Text(3);
     const std::optional<Mode> knownMode = ParseMode(mode);
-    if (!knownMode) {
+    if (!knownMode)
         row.FailRow(fmt::format("mode '{}', expected fp, hg or ds", mode));
-    }
     gesture.mode = *knownMode;
     const std::string end = row.Text(9);
     const std::optional<GestureEnd> knownEnd = ParseEnd(end);
-    if (!knownEnd) {
+    if (!knownEnd)
         row.FailRow(fmt::format("end '{}', expected lift or timeout", end));
-    }
     gesture.end = *knownEnd;
-    if (!row.IsNull(10)) {
+    if (!row.IsNull(10))
         gesture.label = KeyFrom(row, row.Text(10));
-    }
-    for (const std::string& name : TextList(row, 11, "accepted")) {
+    for (const std::string& name : TextList(row, 11, "accepted"))
         gesture.accepted.push_back(KeyFrom(row, name));
-    }
 }
 
 std::optional<int32_t> OptionalInteger(const Statement& row, int column, int64_t lowest,
                                        int64_t highest) {
-    if (row.IsNull(column)) {
+    if (row.IsNull(column))
         return std::nullopt;
-    }
     return static_cast<int32_t>(row.Integer(column, lowest, highest));
 }
 
@@ -100,9 +92,8 @@ RecordedFrame FrameFromRow(const Statement& row) {
     frame.x16 = OptionalInteger(row, 4, kInt32Min, kInt32Max);
     frame.y16 = OptionalInteger(row, 5, kInt32Min, kInt32Max);
     const std::optional<int32_t> presence = OptionalInteger(row, 6, -1, 1);
-    if (presence) {
+    if (presence)
         frame.presence = static_cast<Presence>(*presence);
-    }
     return frame;
 }
 
@@ -137,25 +128,22 @@ void CheckNoneIsMissing(const Database& database) {
     row.Step();
     const int64_t rows = row.Integer(0, 0, INT64_MAX);
     const int64_t ids = row.Integer(1, 0, INT64_MAX);
-    if (rows != ids) {
+    if (rows != ids)
         throw Error(
             database.Path(), "table gesture",
             fmt::format("{} rows, expected {} as its index has: the file is damaged", rows, ids));
-    }
 }
 
 void CheckChecksum(const Statement& row, int column, const Gesture& gesture) {
-    if (row.IsNull(column)) {
+    if (row.IsNull(column))
         return;
-    }
     const int64_t stored = row.Integer(column, 0, kUint32Max);
     const uint32_t computed = GestureChecksum(gesture);
-    if (stored != computed) {
+    if (stored != computed)
         row.FailRow(
             fmt::format("its content has checksum {:#010x}, expected {:#010x} as stored: "
                         "damaged, or changed by another program",
                         computed, stored));
-    }
 }
 
 Gesture GestureFromRow(const Database& database, Statement& row) {
@@ -215,9 +203,8 @@ std::vector<std::string> Store::Ids() const {
     CheckNoneIsMissing(*m_database);
     Statement row(*m_database, "SELECT id FROM gesture ORDER BY seq", "list the gestures");
     std::vector<std::string> ids;
-    while (row.Step()) {
+    while (row.Step())
         ids.push_back(row.Text(0));
-    }
     return ids;
 }
 
@@ -232,9 +219,8 @@ Gesture Store::Read(const std::string& id) const {
     Statement row(*m_database, sums ? kReadOne : kReadOneOfVersion1, "read the gesture");
     row.At(GesturePlace(id));
     row.Bind(1, id);
-    if (!row.Step()) {
+    if (!row.Step())
         throw Error(Path(), GesturePlace(id), "is not in the store, expected one of its ids");
-    }
     return GestureFromRow(*m_database, row);
 }
 

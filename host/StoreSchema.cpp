@@ -68,17 +68,15 @@ constexpr size_t kValidForOffset = 92;
 
 uint32_t ReadBe32(const std::array<char, kHeaderSize>& header, size_t offset) {
     uint32_t value = 0;
-    for (size_t i = 0; i < 4; ++i) {
+    for (size_t i = 0; i < 4; ++i)
         value = (value << 8) | static_cast<uint8_t>(header[offset + i]);
-    }
     return value;
 }
 
 // The file's size in bytes as its header has it; 0 when the header does not know.
 uint64_t SizeOfHeader(const std::array<char, kHeaderSize>& header) {
-    if (ReadBe32(header, kChangeCounterOffset) != ReadBe32(header, kValidForOffset)) {
+    if (ReadBe32(header, kChangeCounterOffset) != ReadBe32(header, kValidForOffset))
         return 0;
-    }
     uint64_t pageSize = ReadBe32(header, kPageSizeOffset) >> 16;
     pageSize = pageSize == 1 ? 65536 : pageSize;
     return pageSize * ReadBe32(header, kPageCountOffset);
@@ -89,78 +87,68 @@ uint64_t SizeOfHeader(const std::array<char, kHeaderSize>& header) {
 void CheckFileSize(const std::string& path, const std::array<char, kHeaderSize>& header) {
     std::error_code error;
     if (std::filesystem::exists(path + "-wal", error) ||
-        std::filesystem::exists(path + "-journal", error)) {
+        std::filesystem::exists(path + "-journal", error))
         return;
-    }
     const uint64_t size = std::filesystem::file_size(path, error);
     const uint64_t expected = SizeOfHeader(header);
-    if (!error && size < expected) {
+    if (!error && size < expected)
         throw Error(path, fmt::format("byte {}", size),
                     fmt::format("the file is truncated, expected {} bytes", expected));
-    }
 }
 
 // What is wrong with a file that cannot be a store, told before SQLite touches it.
 void CheckFileStart(const std::string& path) {
     std::error_code error;
     const std::filesystem::file_status status = std::filesystem::status(path, error);
-    if (!std::filesystem::exists(status)) {
+    if (!std::filesystem::exists(status))
         throw Error(path, "", "no such file, expected a recording store");
-    }
-    if (!std::filesystem::is_regular_file(status)) {
+    if (!std::filesystem::is_regular_file(status))
         throw Error(path, "", "not a regular file, expected a recording store");
-    }
     std::ifstream file(path, std::ios::binary);
-    if (!file) {
+    if (!file)
         throw Error(path, "", std::string("cannot be opened: ") + std::strerror(errno));
-    }
     std::array<char, kHeaderSize> header{};
     file.read(header.data(), kHeaderSize);
     const auto got = static_cast<size_t>(file.gcount());
-    if (got == 0) {
+    if (got == 0)
         throw Error(path, "", "the file is empty, expected a recording store");
-    }
-    if (std::memcmp(header.data(), kMagic, std::min(got, sizeof kMagic)) != 0) {
+    if (std::memcmp(header.data(), kMagic, std::min(got, sizeof kMagic)) != 0)
         throw Error(path, "byte 0", "not a SQLite file, expected a recording store");
-    }
-    if (got < kHeaderSize) {
+    if (got < kHeaderSize)
         throw Error(path, fmt::format("byte {}", got),
                     fmt::format("the file is truncated, expected a SQLite header of {} bytes",
                                 kHeaderSize));
-    }
     CheckFileSize(path, header);
 }
 
 void CheckIdentity(const Database& database) {
     const int64_t application = database.Number("PRAGMA application_id", "read the application id");
-    if (application != kStoreApplicationId) {
+    if (application != kStoreApplicationId)
         throw Error(database.Path(), "",
                     fmt::format("a SQLite database of another program (application id {:#x}, "
                                 "expected {:#x} of a recording store)",
                                 application, kStoreApplicationId));
-    }
     const int64_t version = StoreVersion(database);
-    if (version < kStoreSchemaWithoutChecksums || version > kStoreSchemaVersion) {
+    if (version < kStoreSchemaWithoutChecksums || version > kStoreSchemaVersion)
         throw Error(database.Path(), "",
                     fmt::format("schema version {}, expected {} to {}{}", version,
                                 kStoreSchemaWithoutChecksums, kStoreSchemaVersion,
                                 version > kStoreSchemaVersion
                                     ? ": written by a newer version of this program"
                                     : ""));
-    }
     // Reading the schema shows missing tables and columns now rather than at the first gesture.
     constexpr const char* kDoing = "find the tables of a recording store";
-    Statement(database, "SELECT id, params FROM param_block", kDoing);
-    Statement(database, "SELECT seq, id, param_block, frame_count FROM gesture", kDoing);
-    Statement(database, "SELECT gesture, frame_index, raw FROM frame", kDoing);
+    for (const char* sql : {"SELECT id, params FROM param_block",
+                            "SELECT seq, id, param_block, frame_count FROM gesture",
+                            "SELECT gesture, frame_index, raw FROM frame"})
+        const Statement readable(database, sql, kDoing);
 }
 
 bool IsInt32(const nlohmann::json& value) {
     constexpr int64_t kMin = std::numeric_limits<int32_t>::min();
     constexpr int64_t kMax = std::numeric_limits<int32_t>::max();
-    if (value.is_number_unsigned()) {
+    if (value.is_number_unsigned())
         return value.get<uint64_t>() <= static_cast<uint64_t>(kMax);
-    }
     return value.is_number_integer() && value.get<int64_t>() >= kMin &&
            value.get<int64_t>() <= kMax;
 }
@@ -183,19 +171,17 @@ int64_t StoreVersion(const Database& database) {
 }
 
 void UpgradeSchema(Database& database) {
-    if (StoreVersion(database) != kStoreSchemaWithoutChecksums) {
+    if (StoreVersion(database) != kStoreSchemaWithoutChecksums)
         return;
-    }
     constexpr const char* kDoing = "add the checksums";
     Transaction transaction(database, kDoing);
     // Asked again within the transaction: another process may have done it meanwhile.
-    if (StoreVersion(database) == kStoreSchemaWithoutChecksums) {
+    if (StoreVersion(database) == kStoreSchemaWithoutChecksums)
         database.Execute(
             fmt::format("ALTER TABLE gesture ADD COLUMN checksum INTEGER; PRAGMA user_version = {}",
                         kStoreSchemaVersion)
                 .c_str(),
             kDoing);
-    }
     transaction.Commit();
 }
 
@@ -216,26 +202,23 @@ std::unique_ptr<Database> OpenStoreFile(const std::string& path, bool forAppendi
 
 std::string ParamsToJson(const ParamBlock& params) {
     nlohmann::ordered_json object;
-    for (size_t i = 0; i < params.size(); ++i) {
+    for (size_t i = 0; i < params.size(); ++i)
         object[ParamTable()[i].name] = params[i];
-    }
     return object.dump();
 }
 
 ParamBlock ParamsFromJson(const std::string& text, const std::string& file,
                           const std::string& place) {
     const nlohmann::json object = nlohmann::json::parse(text, nullptr, false);
-    if (!object.is_object() || object.size() != FPNAVI_PARAM_NUM) {
+    if (!object.is_object() || object.size() != FPNAVI_PARAM_NUM)
         throw Error(file, place,
                     fmt::format("params is no JSON object of the {} parameters", FPNAVI_PARAM_NUM));
-    }
     ParamBlock params{};
     for (size_t i = 0; i < params.size(); ++i) {
         const char* const name = ParamTable()[i].name;
         const auto found = object.find(name);
-        if (found == object.end() || !IsInt32(*found)) {
+        if (found == object.end() || !IsInt32(*found))
             throw Error(file, place, fmt::format("params has no 32-bit integer for {}", name));
-        }
         params[i] = found->get<int32_t>();
     }
     return params;

@@ -30,18 +30,16 @@ int64_t StoreParams(const Database& database, const ParamBlock& params) {
     insert.Step();
     Statement find(database, "SELECT id FROM param_block WHERE params = ?", kDoing);
     find.Bind(1, text);
-    if (!find.Step()) {
+    if (!find.Step())
         database.Fail(kDoing);
-    }
     return find.Integer(0, INT64_MIN, INT64_MAX);
 }
 
 int64_t StoreGestureRow(const Database& database, const Gesture& gesture, int64_t paramBlock) {
     const std::string place = GesturePlace(gesture.id);
     std::vector<std::string> acceptedNames;
-    for (const int32_t key : gesture.accepted) {
+    for (const int32_t key : gesture.accepted)
         acceptedNames.push_back(KeyName(key));
-    }
     const std::string accepted = JsonList(acceptedNames, database.Path(), place);
     const std::string tags = JsonList(gesture.tags, database.Path(), place);
     const std::string mode = ModeName(gesture.mode);
@@ -64,11 +62,10 @@ int64_t StoreGestureRow(const Database& database, const Gesture& gesture, int64_
     insert.Bind(7, gesture.geometry.blockRowNum);
     insert.Bind(8, static_cast<int64_t>(gesture.frames.size()));
     insert.Bind(9, end);
-    if (gesture.label) {
+    if (gesture.label)
         insert.Bind(10, label);
-    } else {
+    else
         insert.BindNull(10);
-    }
     insert.Bind(11, accepted);
     insert.Bind(12, gesture.tier);
     insert.Bind(13, tags);
@@ -113,9 +110,8 @@ void PrepareForAppending(Database& database) {
 
 Store Store::OpenForAppending(const std::string& path) {
     auto database = OpenStoreFile(path, true);
-    if (sqlite3_db_readonly(database->Handle(), "main") == 1) {
+    if (sqlite3_db_readonly(database->Handle(), "main") == 1)
         throw Error(path, "", "cannot be written, expected a file with write permission");
-    }
     PrepareForAppending(*database);
     UpgradeSchema(*database);
     return Store(std::move(database), true);
@@ -131,15 +127,13 @@ void Store::Batch::Commit() {
 }
 
 void Store::Append(const Gesture& gesture) {
-    if (!m_appending) {
+    if (!m_appending)
         throw Error(Path(), GesturePlace(gesture.id), "the store is open for reading only");
-    }
     CheckGesture(gesture, Path());
     Transaction transaction(*m_database, "store the gesture");
-    if (Contains(gesture.id)) {
+    if (Contains(gesture.id))
         throw Error(Path(), GesturePlace(gesture.id),
                     "is in the store already, expected an id that is not");
-    }
     const int64_t paramBlock = StoreParams(*m_database, gesture.params);
     const int64_t seq = StoreGestureRow(*m_database, gesture, paramBlock);
     StoreFrames(*m_database, gesture, seq);

@@ -5,6 +5,7 @@
 
 #include "Error.h"
 #include "FpNavi.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "tuning/Tune.h"
 
@@ -21,13 +22,12 @@ void CheckGeometry(const Geometry& geometry, const std::string& source) {
                size * count <= kSideMax;
     };
     if (!sane(geometry.blockWidth, geometry.blockColNum) ||
-        !sane(geometry.blockHeight, geometry.blockRowNum)) {
+        !sane(geometry.blockHeight, geometry.blockRowNum))
         throw Error(source, "parameters",
                     fmt::format("blocks of {} x {} pixels, {} x {} of them; expected image sides "
                                 "of 1 to {}",
                                 geometry.blockWidth, geometry.blockHeight, geometry.blockColNum,
                                 geometry.blockRowNum, kSideMax));
-    }
 }
 
 // The DC that the module takes a register to hold: in the layouts without one, what it remembers.
@@ -49,21 +49,16 @@ void ReadState(TuneCall* call) {
 }
 
 TuneEnd EndOf(const TuneCall& call) {
-    if (call.result < 0) {
+    if (call.result < 0)
         return TuneEnd::Failed;
-    }
-    if (call.result == 0) {
+    if (call.result == 0)
         return TuneEnd::Unfinished;
-    }
-    if (fpnavi::s_modeFlag == 1) {
+    if (fpnavi::IsHg())
         return TuneEnd::NotNeeded;
-    }
-    if (call.effective == 0) {
+    if (call.effective == 0)
         return TuneEnd::InBand;
-    }
-    if (call.noMoreProcess > 1) {
+    if (call.noMoreProcess > 1)
         return TuneEnd::CallLimit;
-    }
     // Not by the direction: the first call of a run has cleared it by now.
     const bool atTop = call.recommended == -1 && call.dcBefore == kDcMax;
     const bool atBottom = call.recommended == 1 && call.dcBefore == fpnavi::_NAVI_DC_REF;
@@ -75,13 +70,12 @@ TuneCall CallOnce(const TuneSetup& setup, const Geometry& geometry, uint32_t dac
     TuneCall call;
     call.registerBefore = call.registerAfter = dac;
     call.dcBefore = DcNow(dac);
-    call.measured = fpnavi::s_modeFlag != 1 && call.dcBefore >= fpnavi::_NAVI_DC_REF;
+    call.measured = !fpnavi::IsHg() && call.dcBefore >= fpnavi::_NAVI_DC_REF;
     std::vector<uint8_t> image(raw.size());
     call.result = GetNaviBlock(raw.data(), geometry.Width(), geometry.Height(), image.data());
-    if (call.result == 0) {
+    if (call.result == 0)
         call.result = _NAVI_Tune(image.data(), geometry.Width(), geometry.Height(),
                                  &call.registerAfter, &setup.gain20, &setup.gain2C);
-    }
     call.dcAfter = DcNow(call.registerAfter);
     ReadState(&call);
     return call;
@@ -118,14 +112,12 @@ TuneRun RunTuning(const TuneSetup& setup, const FrameSource& grab, const std::st
     while (run.end == TuneEnd::Unfinished &&
            run.calls.size() < static_cast<size_t>(setup.maxCalls)) {
         const std::vector<uint8_t> raw = grab(run.lastRegister);
-        if (raw.empty()) {
+        if (raw.empty())
             break;
-        }
-        if (raw.size() != frameSize) {
+        if (raw.size() != frameSize)
             throw Error(source, fmt::format("frame {}", run.calls.size()),
                         fmt::format("{} bytes, expected {} ({} x {})", raw.size(), frameSize,
                                     geometry.Width(), geometry.Height()));
-        }
         run.calls.push_back(CallOnce(setup, geometry, run.lastRegister, raw));
         run.lastRegister = run.calls.back().registerAfter;
         run.end = EndOf(run.calls.back());
@@ -134,20 +126,17 @@ TuneRun RunTuning(const TuneSetup& setup, const FrameSource& grab, const std::st
 }
 
 int32_t DcOfRegister(int32_t layout, uint32_t value, int32_t fallback) {
-    if (layout == 1) {
+    if (layout == 1)
         return static_cast<int32_t>(value & 0xFFU);
-    }
-    if (layout == 0) {
+    if (layout == 0)
         return static_cast<int32_t>((value >> 8) & 0xFFU) - static_cast<int32_t>(value & 0xFFU);
-    }
     return fallback;
 }
 
 uint32_t RegisterOfDc(int32_t layout, int32_t dc, uint32_t value) {
     const auto byte = static_cast<uint32_t>(dc) & 0xFFU;
-    if (layout == 1) {
+    if (layout == 1)
         return (value & ~0xFFU) | byte;
-    }
     if (layout == 0) {
         const uint32_t pair = 0xFF00U | (255U - byte);
         return (pair << 16) | pair;

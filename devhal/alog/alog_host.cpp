@@ -8,7 +8,8 @@
 namespace alog {
 namespace {
 
-__attribute__((format(printf, 4, 0))) int WriteToStderr(void*, int, const char*, const char* format,
+__attribute__((format(printf, 4, 0))) int WriteToStderr(void* /*context*/, int /*level*/,
+                                                        const char* /*tag*/, const char* format,
                                                         std::va_list args) {
     return std::vfprintf(stderr, format, args);
 }

@@ -92,7 +92,7 @@ void ReplayPictures(uint64_t test, Mode mode, MakeParams makeParams, int64_t per
         while (!CheapEnough(params))
             params = makeParams(random, mode);
         twin.SetParam(&params);
-        if (!twin.ImageFits())
+        if (!Twin::ImageFits())
             continue;
         twin.Clear();
         const host::Geometry geometry = host::GeometryOf(params);
@@ -214,6 +214,15 @@ TEST(CompareWrittenPairCounts, DoubleScanMode) {
     ReplayWithWrittenCounts(63, Mode::DoubleScan, 3);
 }
 
+// An image of any size that the parameters may ask for; its first 4096 pixels are noise around a
+// level.
+std::vector<uint8_t> NoisyImage(int32_t level, int32_t spread, SimRandom& random) {
+    std::vector<uint8_t> image(size_t{1} << 20);
+    for (size_t p = 0; p < 4096; ++p)
+        image[p] = static_cast<uint8_t>(std::clamp(level + random.Range(-spread, spread), 0, 255));
+    return image;
+}
+
 // Tuning runs with gestures between them.
 TEST(CompareTuning, RunsOfAllModes) {
     Twin& twin = Twin::Get();
@@ -229,7 +238,7 @@ TEST(CompareTuning, RunsOfAllModes) {
         if (random.Chance(30))
             host::ParamValue(params, "_NAVI_TimeOut_threshold") = random.Range(-1, 6);
         twin.SetParam(&params);
-        if (!twin.ImageFits())
+        if (!Twin::ImageFits())
             continue;
         twin.SetDac(static_cast<uint32_t>(random.Next()));
         const uint32_t gainMask = random.Chance(90) ? 0x00070707U : 0xFFFFFFFFU;
@@ -238,12 +247,7 @@ TEST(CompareTuning, RunsOfAllModes) {
         const int32_t base = random.Range(0, 255);
         const int32_t spread = random.Chance(40) ? 2 : random.Range(1, 100);
         for (int32_t call = 0; call < random.Range(1, 8); ++call) {
-            std::vector<uint8_t> image(size_t{1} << 20);
-            const int32_t level = base + random.Range(-60, 60);
-            for (size_t p = 0; p < 4096; ++p)
-                image[p] =
-                    static_cast<uint8_t>(std::clamp(level + random.Range(-spread, spread), 0, 255));
-            twin.Tune(image, gain20, gain2C);
+            twin.Tune(NoisyImage(base + random.Range(-60, 60), spread, random), gain20, gain2C);
             if (random.Chance(10))
                 twin.SetDac(static_cast<uint32_t>(random.Next()));
             if (random.Chance(10))

@@ -33,9 +33,8 @@ void CompareJoints(uint64_t test, int64_t cases, DrawPair draw) {
         ASSERT_FALSE(::testing::Test::HasFailure()) << "case " << i;
         ASSERT_EQ(outcome.module, outcome.plain) << "case " << i;
         ASSERT_TRUE(SameState()) << "case " << i;
-        if (outcome.module == 0) {
+        if (outcome.module == 0)
             ++joined;
-        }
     }
     EXPECT_GT(joined, cases / 3) << "most parameters allowed no search";
     EXPECT_LT(joined, cases) << "nothing failed";

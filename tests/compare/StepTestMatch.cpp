@@ -115,7 +115,8 @@ TEST(StepFindMatch, RandomDisplacementsGiveTheSameBest) {
 // What the module scores for a displacement of the current pair.
 int32_t ModuleScore(int32_t di, int32_t dj, int32_t most) {
     const fpnavi::FramePair pair = fpnavi::LayOutPair(fpnavi::s_imagePrev, fpnavi::s_imageCurr);
-    fpnavi::DisplacementScore score(fpnavi::CurrentSearchParams(), pair);
+    fpnavi::ColumnMeetings columns;
+    fpnavi::DisplacementScore score(fpnavi::CurrentSearchParams(), pair, &columns, 1);
     return score.At({di, dj}, most);
 }
 

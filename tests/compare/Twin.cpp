@@ -123,7 +123,7 @@ void Twin::FailAllocation(int32_t number, bool forGood) {
     m_failingForGood = forGood;
 }
 
-bool Twin::ImageFits() const {
+bool Twin::ImageFits() {
     using namespace fpnavi;
     const auto fits = [](int32_t width, int32_t height) {
         return int64_t{width} * height <= static_cast<int64_t>(kImageBytes);

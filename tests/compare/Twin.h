@@ -37,7 +37,7 @@ class Twin {
     void FailAllocation(int32_t number, bool forGood);
 
     // The frames that the current parameters ask for fit the image buffer.
-    bool ImageFits() const;
+    static bool ImageFits();
 
     // The first difference seen; empty while there is none.
     const std::optional<std::string>& Difference() const { return m_difference; }

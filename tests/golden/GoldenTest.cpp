@@ -20,9 +20,9 @@ std::map<std::string, std::string> KeptLines() {
 
 void ExpectKeptRecords(const Implementation& implementation, host::Mode mode) {
     const std::map<std::string, std::string> kept = KeptLines();
-    ASSERT_EQ(kept.size(), 24u) << "in " << FPNAVI_GOLDEN_RECORDS;
+    ASSERT_EQ(kept.size(), 24U) << "in " << FPNAVI_GOLDEN_RECORDS;
     for (const host::Gesture& gesture : GoldenGestures(mode)) {
-        ASSERT_EQ(kept.count(gesture.id), 1u) << gesture.id;
+        ASSERT_EQ(kept.count(gesture.id), 1U) << gesture.id;
         EXPECT_EQ(OutcomeLine(gesture.id, Record(implementation, gesture)), kept.at(gesture.id));
     }
 }

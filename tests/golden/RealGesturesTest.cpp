@@ -37,7 +37,7 @@ TEST_F(RealGestures, EveryCoreGestureGetsItsKey) {
         EXPECT_EQ(result.verdict, host::Verdict::Right)
             << result.id << " got " << host::KeyName(result.key);
     }
-    EXPECT_GT(core, 0u);
+    EXPECT_GT(core, 0U);
 }
 
 TEST_F(RealGestures, NoGestureGetsAKeyOutsideItsAcceptedOnes) {

@@ -28,9 +28,8 @@ inline CommandEnd RunCommand(const std::vector<std::string>& arguments,
         constexpr unsigned kHangSeconds = 120;
         alarm(kHangSeconds);
         const rlimit limit = {fileSizeMax, fileSizeMax};
-        if (setrlimit(RLIMIT_FSIZE, &limit) != 0) {
+        if (setrlimit(RLIMIT_FSIZE, &limit) != 0)
             return 125;
-        }
         std::vector<std::string> words = {FPNAVI_COMMAND};
         words.insert(words.end(), arguments.begin(), arguments.end());
         return Exec(words, out, errPath);
@@ -47,9 +46,8 @@ inline CommandEnd RunCommand(const std::vector<std::string>& arguments,
 // The words as a shell would take them, for messages.
 inline std::string Joined(const std::vector<std::string>& words) {
     std::string line;
-    for (const std::string& word : words) {
+    for (const std::string& word : words)
         line += (line.empty() ? "" : " ") + word;
-    }
     return line;
 }
 

@@ -142,7 +142,7 @@ TEST_F(Command, ReplayOfASmallCorpusAddsUp) {
     const Outcome outcome = Run("replay c.db --json");
     const std::vector<json> lines = JsonLines(outcome.out);
     const std::vector<json> gestures = OfKind("gesture", lines);
-    ASSERT_EQ(gestures.size(), 12u);
+    ASSERT_EQ(gestures.size(), 12U);
     EXPECT_EQ(gestures[4].at("id"), host::Store::OpenForReading(Path("c.db")).Ids()[4]);
     std::map<std::string, int> verdicts;
     for (const json& gesture : gestures)
@@ -180,7 +180,7 @@ TEST_F(Command, QuietShowsTheSummaryOnly) {
     const Outcome outcome = Run("replay c.db --quiet");
     EXPECT_THAT(outcome.out, StartsWith("mode  tier"));
     EXPECT_THAT(outcome.out, Not(HasSubstr("gesture-a")));
-    EXPECT_EQ(OfKind("gesture", JsonLines(Run("replay c.db --quiet --json").out)).size(), 0u);
+    EXPECT_EQ(OfKind("gesture", JsonLines(Run("replay c.db --quiet --json").out)).size(), 0U);
 }
 
 TEST_F(Command, ReplayTakesParametersByName) {
@@ -241,7 +241,7 @@ TEST_F(Command, ExplainsAGestureFrameByFrame) {
     EXPECT_THAT(table.out, EndsWith("vote: RIGHT (2 pairs, time_out 0), label RIGHT: right\n"));
     const std::vector<json> lines = JsonLines(Run("replay c.db --gesture a --json").out);
     const std::vector<json> frames = OfKind("frame", lines);
-    ASSERT_EQ(frames.size(), 4u);
+    ASSERT_EQ(frames.size(), 4U);
     EXPECT_EQ(frames[0].at("settled_by"), "first frame");
     EXPECT_EQ(frames[1].at("dx_fp"), 6);
     EXPECT_EQ(frames[1].at("vkey_fp"), "RIGHT");
@@ -251,7 +251,7 @@ TEST_F(Command, ExplainsAGestureFrameByFrame) {
 
 TEST_F(Command, ParamsListsAllWithTheirDefaults) {
     const std::vector<json> params = OfKind("param", JsonLines(Run("params --json").out));
-    ASSERT_EQ(params.size(), 78u);
+    ASSERT_EQ(params.size(), 78U);
     EXPECT_EQ(params[69].at("name"), "s_minDelta");
     EXPECT_EQ(params[69].at("index"), 69);
     EXPECT_EQ(params[69].at("value"), 4);

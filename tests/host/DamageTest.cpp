@@ -92,9 +92,8 @@ Tally Flip(const Reader& reader) {
     Bytes damaged = sound;
     for (size_t at = 0; at < sound.size(); at += step) {
         for (size_t bit = 0; bit < 8; ++bit) {
-            if (reader.sampling > 1 && bit != (at + at / 7) % 8) {
+            if (reader.sampling > 1 && bit != (at + at / 7) % 8)
                 continue;
-            }
             damaged[at] = static_cast<uint8_t>(sound[at] ^ (1U << bit));
             Try(reader, damaged, "byte " + std::to_string(at) + ", bit " + std::to_string(bit),
                 &tally);
@@ -111,9 +110,8 @@ Gesture TinyGesture(const std::string& id) {
     gesture.id = id;
     gesture.params = host::ParamsForMode(host::Mode::Fp, true);
     for (const char* side :
-         {"s_blockWidthFp", "s_blockHeightFp", "s_blockColNumFp", "s_blockRowNumFp"}) {
+         {"s_blockWidthFp", "s_blockHeightFp", "s_blockColNumFp", "s_blockRowNumFp"})
         host::ParamValue(gesture.params, side) = 2;
-    }
     gesture.geometry = host::GeometryOf(gesture.params);
     gesture.label = VKEY_LEFT;
     gesture.accepted = {VKEY_LEFT, VKEY_NONE};
@@ -138,9 +136,8 @@ std::string TinyStore() {
     const std::string path = MemoryDirectory() + "/s.db";
     {
         Store store = Store::Create(path);
-        for (const Gesture& gesture : TinyGestures()) {
+        for (const Gesture& gesture : TinyGestures())
             store.Append(gesture);
-        }
     }
     host_test::RunSql(path, "PRAGMA page_size = 512; VACUUM");
     return path;
@@ -178,9 +175,8 @@ TEST(Damage, OfALogLeavesTheGesturesBeforeIt) {
     const std::string path = MemoryDirectory() + "/s.db";
     const pid_t child = host_test::InChild([&] {
         Store store = Store::Create(path);
-        for (const Gesture& gesture : TinyGestures()) {
+        for (const Gesture& gesture : TinyGestures())
             store.Append(gesture);
-        }
         return raise(SIGKILL);
     });
     host_test::StatusOf(child);
@@ -222,9 +218,8 @@ TEST(Damage, OfAnIndexIsToldWithItsLineOrGivesASoundGesture) {
               "id,tier,mode,layout,kind,expect,accept,end,source,quality,frames\n"
               "g,hard,fp,tiled,stroke:UP,UP,UP NO_MOVE,lift,sim,good,2\n");
     const auto read = [&] {
-        for (const Gesture& gesture : host::ImportFng(directory)) {
+        for (const Gesture& gesture : host::ImportFng(directory))
             host::CheckGesture(gesture, path);
-        }
     };
     const Reader reader = {"index.csv", path, "[0-9]+: ", read};
     const Tally cut = Cut(reader);

@@ -15,7 +15,6 @@ using host::Mode;
 using host::SettledBy;
 using host_test::GestureBuilder;
 using host_test::Rect;
-using ::testing::Each;
 using ::testing::ElementsAre;
 
 std::vector<SettledBy> Settled(const Explanation& explanation) {
@@ -109,7 +108,7 @@ TEST(Explain, TheHundredthPairFindsTheRecordFull) {
     for (int32_t i = 0; i < 102; ++i)
         builder.Skin(0);
     const Explanation full = ExplainHere(builder.Get());
-    ASSERT_EQ(full.frames.size(), 102u);
+    ASSERT_EQ(full.frames.size(), 102U);
     EXPECT_EQ(full.frames[99].settledBy, SettledBy::NoMoveTest);  // pair 98, the last that fits
     EXPECT_EQ(full.frames[100].settledBy, SettledBy::RecordFull);
     EXPECT_EQ(full.frames[101].settledBy, SettledBy::RecordFull);

@@ -64,9 +64,8 @@ TEST(FngIndex, FilesComeInTheOrderOfTheirNamesAndWithoutARowIfNone) {
 
 TEST(FngIndex, LinesMayEndLikeOnWindows) {
     std::string index = std::string(kColumns) + kRow;
-    for (size_t at = index.find('\n'); at != std::string::npos; at = index.find('\n', at + 2)) {
+    for (size_t at = index.find('\n'); at != std::string::npos; at = index.find('\n', at + 2))
         index.insert(at, "\r");
-    }
     EXPECT_EQ(host::ImportFng(DirectoryWithIndex(index)).at(0).tier, "hard");
 }
 
@@ -109,11 +108,10 @@ TEST(FngIndex, RowThatContradictsTheFileIsRefused) {
         {"g,hard,fp,tiled,stroke:UP,UP,UP,timeout,2", "end"},
         {"g,hard,fp,tiled,stroke:UP,UP,UP,lift,3", "frames"},
     };
-    for (const auto& [row, column] : rows) {
+    for (const auto& [row, column] : rows)
         EXPECT_THAT(IndexError(std::string(kColumns) + row + "\n"),
                     HasSubstr(std::string("index.csv:2: ") + column + " of 'g' differs"))
             << row;
-    }
 }
 
 TEST(FngIndex, DirectoryWithoutRecordingsIsRefused) {

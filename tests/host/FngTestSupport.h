@@ -37,13 +37,11 @@ inline void PutFrame(Bytes& bytes, size_t frame) {
     bytes[start + 13] = frame == 0 ? 255 : 1;                // presence: a sliver, then a finger
     uint8_t* const rows = &bytes[start + kFrameHead];
     uint8_t* blocks = rows + kPixels;
-    for (size_t i = 0; i < kPixels; ++i) {
+    for (size_t i = 0; i < kPixels; ++i)
         rows[i] = PixelAt(frame, i / kWidth, i % kWidth);
-    }
     for (size_t block = 0; block < 126; ++block) {
-        for (size_t k = 0; k < 16; ++k) {
+        for (size_t k = 0; k < 16; ++k)
             *blocks++ = PixelAt(frame, block / 7 * 2 + k / 8, block % 7 * 8 + k % 8);
-        }
     }
 }
 

@@ -56,19 +56,15 @@ class ForeignFiles : public ::testing::Test {
     // Makes the file called kind anew. False where this machine cannot.
     bool Make(const std::string& kind) const {
         const std::string path = File(kind);
-        if (IsDevice(kind)) {
+        if (IsDevice(kind))
             return fs::exists(kind);
-        }
         fs::remove_all(path);
-        if (kind == "missing") {
+        if (kind == "missing")
             return true;
-        }
-        if (kind == "pipe") {
+        if (kind == "pipe")
             return mkfifo(path.c_str(), 0600) == 0;
-        }
-        if (kind == "directory") {
+        if (kind == "directory")
             return fs::create_directory(path);
-        }
         if (kind == "dangling" || kind == "loop") {
             fs::create_symlink(kind == "loop" ? path : "nowhere", path);
             return true;
@@ -104,11 +100,10 @@ class ForeignFiles : public ::testing::Test {
     void Check(const Use& use, const std::string& kind) const {
         const std::string path = File(kind);
         Words words;
-        for (const std::string& word : use.words) {
+        for (const std::string& word : use.words)
             words.push_back(word == "@"      ? path
                             : word[0] == '%' ? m_directory + word.substr(1)
                                              : word);
-        }
         fs::remove(m_directory + "/new.db");
         const CommandEnd end = RunCommand(words);
         const std::string line = Joined(words);
@@ -156,9 +151,8 @@ TEST_F(ForeignFiles, AreRefusedAsTheIndexOfADirectory) {
     const std::string index = recordings + "/index.csv";
     for (const char* kind : {"empty", "text", "png", "fng", "raw", "toml", "store", "directory",
                              "pipe", "dangling", "loop", "unreadable"}) {
-        if (!Make(kind)) {
+        if (!Make(kind))
             continue;
-        }
         fs::remove_all(index);
         fs::rename(File(kind), index);
         const CommandEnd end = RunCommand({"import", m_directory + "/new.db", recordings});

@@ -41,9 +41,8 @@ Words Synth(const std::string& path, size_t first, size_t count, bool append) {
                    "--seed",  std::to_string(kSeed),
                    "--first", std::to_string(first),
                    "--count", std::to_string(count)};
-    if (append) {
+    if (append)
         words.push_back("--append");
-    }
     return words;
 }
 
@@ -51,10 +50,9 @@ Words Synth(const std::string& path, size_t first, size_t count, bool append) {
 size_t WholeGestures(const std::string& path) {
     size_t count = 0;
     Store::OpenForReading(path).ForEach([&](const Gesture& gesture) {
-        if (gesture.id.compare(0, 3, "sim") == 0) {
+        if (gesture.id.compare(0, 3, "sim") == 0)
             ExpectSameGesture(gesture,
                               host::SimulateCorpusGesture(kSeed, static_cast<int64_t>(count)));
-        }
         ++count;
     });
     return count;
@@ -72,22 +70,18 @@ class FullDisk : public ::testing::Test {
         constexpr rlim_t kStep = 12000;
         int failures = 0;
         for (rlim_t limit = 1000;; limit += kStep) {
-            for (const char* suffix : {"", "-wal", "-shm", "-journal"}) {
+            for (const char* suffix : {"", "-wal", "-shm", "-journal"})
                 fs::remove(m_path + suffix);
-            }
-            if (former > 0) {
+            if (former > 0)
                 fs::copy_file(kept, m_path);
-            }
             const CommandEnd end = RunCommand(words, "/dev/null", limit);
             SCOPED_TRACE(Joined(words) + " with files of " + std::to_string(limit) + " bytes");
-            if (end.exitCode == 0) {
+            if (end.exitCode == 0)
                 return failures;
-            }
             ++failures;
             CheckFailure(end, former, atOnce);
-            if (HasFailure()) {
+            if (HasFailure())
                 return failures;
-            }
         }
     }
 
@@ -123,9 +117,8 @@ TEST_F(FullDisk, OfSynthThatAppends) {
 TEST_F(FullDisk, OfImport) {
     const std::string files = m_directory + "/files";
     fs::create_directory(files);
-    for (const char* name : {"/a.fng", "/b.fng", "/c.fng", "/d.fng"}) {
+    for (const char* name : {"/a.fng", "/b.fng", "/c.fng", "/d.fng"})
         WriteBytes(files + name, host_test::FngBytes());
-    }
     EXPECT_GT(TryAllLimits({"import", m_path, files}, 0, true), 2);
     EXPECT_GT(TryAllLimits({"import", m_path, files}, kFormer, true), 2);
 }
@@ -149,9 +142,8 @@ TEST_F(FullDisk, OfARealFileSystem) {
     const pid_t child = host_test::InChild([&] {
         const std::string directory = host_test::MemoryDirectory();
         const std::string path = directory + "/c.db";
-        if (!EnterSmallFileSystem(directory)) {
+        if (!EnterSmallFileSystem(directory))
             return kNotAllowed;
-        }
         const CommandEnd end = RunCommand(Synth(path, 0, 100, false));
         EXPECT_EQ(end.exitCode, 3);
         EXPECT_THAT(end.err, StartsWith("fpnavi: " + path + ": cannot store the "));
@@ -168,9 +160,8 @@ TEST_F(FullDisk, OfARealFileSystem) {
     });
     const int status = host_test::StatusOf(child);
     ASSERT_TRUE(WIFEXITED(status));
-    if (WEXITSTATUS(status) == kNotAllowed) {
+    if (WEXITSTATUS(status) == kNotAllowed)
         GTEST_SKIP() << "this process may not mount a file system";
-    }
     EXPECT_EQ(WEXITSTATUS(status), 0);
 }
 

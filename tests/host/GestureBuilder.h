@@ -14,10 +14,10 @@ namespace host_test {
 
 // Grey noise without structure, a fixed function of the place: 0..255.
 inline uint8_t NoiseAt(int32_t row, int32_t column) {
-    uint32_t h = static_cast<uint32_t>(row + 1000) * 2654435761u ^
-                 static_cast<uint32_t>(column + 1000) * 2246822519u;
+    uint32_t h = static_cast<uint32_t>(row + 1000) * 2654435761U ^
+                 static_cast<uint32_t>(column + 1000) * 2246822519U;
     h ^= h >> 15;
-    h *= 2246822519u;
+    h *= 2246822519U;
     h ^= h >> 13;
     return static_cast<uint8_t>(h >> 16);
 }

@@ -95,9 +95,8 @@ inline host::Gesture SmallGesture(const std::string& id, size_t frameCount = 3) 
     for (size_t i = 0; i < frameCount; ++i) {
         host::RecordedFrame frame;
         frame.raw.resize(56 * 36);
-        for (size_t k = 0; k < frame.raw.size(); ++k) {
+        for (size_t k = 0; k < frame.raw.size(); ++k)
             frame.raw[k] = static_cast<uint8_t>(k * 7 + i * 31);
-        }
         gesture.frames.push_back(frame);
     }
     return gesture;
@@ -108,13 +107,11 @@ inline std::string RealDataDirectory() {
     const char* const fromEnvironment = std::getenv("FPNAVI_REALDATA");
     std::string directory = fromEnvironment != nullptr ? fromEnvironment : "";
 #ifdef FPNAVI_REALDATA_DEFAULT
-    if (directory.empty()) {
+    if (directory.empty())
         directory = FPNAVI_REALDATA_DEFAULT;
-    }
 #endif
-    if (directory.empty() || !std::filesystem::exists(directory + "/gestures/index.csv")) {
+    if (directory.empty() || !std::filesystem::exists(directory + "/gestures/index.csv"))
         return "";
-    }
     return directory;
 }
 

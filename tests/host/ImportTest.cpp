@@ -113,13 +113,11 @@ TEST(Fng, NoLabelGivesNoAcceptedKey) {
 TEST(Fng, TruncationIsRefusedAtEveryBoundary) {
     const Bytes bytes = FngBytes();
     std::vector<size_t> lengths;
-    for (size_t i = 0; i <= kHeader + kFrameHead; ++i) {
+    for (size_t i = 0; i <= kHeader + kFrameHead; ++i)
         lengths.push_back(i);
-    }
     for (const size_t length : {kHeader + kFrameHead + kPixels, kHeader + kFrame - 1,
-                                kHeader + kFrame, kHeader + kFrame + 1, bytes.size() - 1}) {
+                                kHeader + kFrame, kHeader + kFrame + 1, bytes.size() - 1})
         lengths.push_back(length);
-    }
     for (const size_t length : lengths) {
         const Bytes part(bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(length));
         EXPECT_THAT(FngError(part),
@@ -186,9 +184,8 @@ TEST(Fng, WrongFrameFieldsAreRefusedAtTheirOffset) {
 
 TEST(RealRecordings, AllAreImported) {
     const std::string directory = host_test::RealDataDirectory();
-    if (directory.empty()) {
+    if (directory.empty())
         GTEST_SKIP() << "no real recordings: set FPNAVI_REALDATA to their directory";
-    }
     const std::vector<Gesture> gestures = host::ImportFng(directory + "/gestures");
     EXPECT_EQ(gestures.size(), 44U);
     for (const Gesture& gesture : gestures) {

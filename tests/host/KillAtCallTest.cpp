@@ -36,33 +36,29 @@ bool IsLastCall() {
 }
 
 int CountedOpen(const char* path, int flags, int mode) {
-    if ((flags & O_CREAT) != 0 && IsLastCall()) {
+    if ((flags & O_CREAT) != 0 && IsLastCall())
         KillSelf();
-    }
     return open(path, flags, mode);
 }
 
 ssize_t CountedWrite(int file, const void* bytes, size_t size, off_t offset) {
     if (IsLastCall()) {
-        if (s_halfWrite && pwrite(file, bytes, size / 2, offset) < 0) {
+        if (s_halfWrite && pwrite(file, bytes, size / 2, offset) < 0)
             std::perror("pwrite");
-        }
         KillSelf();
     }
     return pwrite(file, bytes, size, offset);
 }
 
 int CountedTruncate(int file, off_t size) {
-    if (IsLastCall()) {
+    if (IsLastCall())
         KillSelf();
-    }
     return ftruncate(file, size);
 }
 
 int CountedUnlink(const char* path) {
-    if (IsLastCall()) {
+    if (IsLastCall())
         KillSelf();
-    }
     return unlink(path);
 }
 
@@ -81,9 +77,8 @@ void CountCalls() {
 
 // Gestures in the store, each whole; -1: there is no store.
 int WholeGestures(const std::string& path) {
-    if (!std::filesystem::exists(path)) {
+    if (!std::filesystem::exists(path))
         return -1;
-    }
     int count = 0;
     int64_t frames = 0;
     Store::OpenForReading(path).ForEach([&](const Gesture& gesture) {

@@ -39,9 +39,8 @@ constexpr int kImported = 40;
 
 std::vector<Gesture> Simulated(size_t first, size_t count) {
     std::vector<Gesture> gestures;
-    for (size_t i = first; i < first + count; ++i) {
+    for (size_t i = first; i < first + count; ++i)
         gestures.push_back(host::SimulateCorpusGesture(kSeed, static_cast<int64_t>(i)));
-    }
     return gestures;
 }
 
@@ -100,12 +99,10 @@ class Kills : public ::testing::Test {
 };
 
 void Kills::Prepare(const Scenario& scenario) const {
-    for (const char* suffix : {"", "-wal", "-shm", "-journal"}) {
+    for (const char* suffix : {"", "-wal", "-shm", "-journal"})
         std::filesystem::remove(m_path + suffix);
-    }
-    if (!scenario.former.empty()) {
+    if (!scenario.former.empty())
         std::filesystem::copy_file(m_directory + "/former.db", m_path);
-    }
 }
 
 // The middle one of three.
@@ -125,9 +122,8 @@ bool Kills::KilledAfter(const Scenario& scenario, Seconds moment, bool watched) 
     const pid_t child = StartCommand(scenario.arguments);
     std::this_thread::sleep_until(start + std::chrono::duration_cast<Clock::duration>(moment));
     m_seen = 0;
-    if (watched && std::filesystem::exists(m_path)) {
+    if (watched && std::filesystem::exists(m_path))
         m_seen = static_cast<size_t>(Store::OpenForReading(m_path).Count());
-    }
     kill(child, SIGKILL);
     return WIFSIGNALED(StatusOf(child));
 }
@@ -139,9 +135,8 @@ size_t Kills::CheckContent(const Scenario& scenario) const {
     const std::vector<std::string> ids = store.Ids();
     const bool replaced =
         scenario.replaces && (ids.empty() || ids.front() == scenario.added.front().id);
-    if (replaced) {
+    if (replaced)
         expected.clear();
-    }
     const size_t former = expected.size();
     expected.insert(expected.end(), scenario.added.begin(), scenario.added.end());
     EXPECT_GE(ids.size(), former);
@@ -187,9 +182,8 @@ void Kills::CheckAndFinish(const Scenario& scenario) {
 void Kills::Run(const Scenario& scenario) {
     if (!scenario.former.empty()) {
         Store former = Store::Create(m_directory + "/former.db");
-        for (const Gesture& gesture : scenario.former) {
+        for (const Gesture& gesture : scenario.former)
             former.Append(gesture);
-        }
     }
     const Seconds runTime = UsualRunTime(scenario);
     const uint64_t wanted = NumberFromEnvironment("FPNAVI_KILLS", 3);

@@ -63,9 +63,8 @@ TEST(ParamTable, PlainLayoutHasNoGaps) {
 }
 
 TEST(Keys, NamesAndValuesAreInverse) {
-    for (int32_t key = VKEY_NONE; key <= VKEY_NO_MOVE; ++key) {
+    for (int32_t key = VKEY_NONE; key <= VKEY_NO_MOVE; ++key)
         EXPECT_EQ(host::ParseKey(host::KeyName(key)), key);
-    }
     EXPECT_EQ(host::ParseKey("no_move"), VKEY_NO_MOVE);
     EXPECT_EQ(host::KeyName(VKEY_RIGHT), "RIGHT");
     EXPECT_FALSE(host::ParseKey("SIDEWAYS").has_value());
@@ -171,9 +170,8 @@ TEST(ParamFile, BrokenTomlIsRefusedWithItsPosition) {
 
 TEST(ParamFile, WrittenTextIsReadAgain) {
     ParamBlock params{};
-    for (size_t i = 0; i < params.size(); ++i) {
+    for (size_t i = 0; i < params.size(); ++i)
         params[i] = static_cast<int32_t>(i * 1000) - 30000;
-    }
     EXPECT_EQ(ParseParams(host::ParamFileText(params), "p.toml"), params);
     EXPECT_EQ(ParseParams(host::ParamFileText(DefaultParams()), "p.toml"), DefaultParams());
 }

@@ -24,9 +24,8 @@ inline uint64_t NumberFromEnvironment(const char* name, uint64_t otherwise) {
 template <typename Action>
 pid_t InChild(Action action) {
     const pid_t child = fork();
-    if (child == 0) {
+    if (child == 0)
         _exit(action());
-    }
     return child;
 }
 
@@ -41,15 +40,14 @@ inline int StatusOf(pid_t child) {
 inline int Exec(const std::vector<std::string>& words, const std::string& outPath,
                 const std::string& errPath) {
     std::vector<char*> arguments;
-    for (const std::string& word : words) {
+    arguments.reserve(words.size() + 1);
+    for (const std::string& word : words)
         arguments.push_back(const_cast<char*>(word.c_str()));
-    }
     arguments.push_back(nullptr);
     const int out = open(outPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
     const int err = open(errPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
-    if (dup2(out, STDOUT_FILENO) < 0 || dup2(err, STDERR_FILENO) < 0) {
+    if (dup2(out, STDOUT_FILENO) < 0 || dup2(err, STDERR_FILENO) < 0)
         return 126;
-    }
     execv(arguments[0], arguments.data());
     return 127;
 }

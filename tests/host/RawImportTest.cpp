@@ -24,9 +24,8 @@ host::RawRecording RawWith(size_t frameBytes) {
     host::RawRecording recording;
     recording.framesPath = TestDirectory() + "/dump.raw";
     Bytes bytes(frameBytes);
-    for (size_t i = 0; i < bytes.size(); ++i) {
+    for (size_t i = 0; i < bytes.size(); ++i)
         bytes[i] = static_cast<uint8_t>(i / kPixels + 1);
-    }
     WriteBytes(recording.framesPath, bytes);
     return recording;
 }

@@ -47,6 +47,7 @@ Gesture Resting(const std::string& id) {
 
 std::vector<std::string> Ids(const std::vector<ReplayResult>& results) {
     std::vector<std::string> ids;
+    ids.reserve(results.size());
     for (const ReplayResult& result : results)
         ids.push_back(result.id);
     return ids;
@@ -65,7 +66,7 @@ bool HoldsInChild(const std::function<bool()>& condition) {
 TEST(ReplayProcess, ADoubleScanGestureDoesNotChangeTheOnesAfterIt) {
     const std::vector<ReplayResult> alone = ReplayAll({Right("a")}, 1);
     const std::vector<ReplayResult> after = ReplayAll({DoubleScan("d"), Right("a")}, 1);
-    ASSERT_EQ(after.size(), 2u);
+    ASSERT_EQ(after.size(), 2U);
     EXPECT_EQ(after[0].pairs, 1);
     EXPECT_EQ(alone[0].pairs, 2);
     EXPECT_EQ(after[1].pairs, 2);
@@ -200,7 +201,7 @@ TEST_F(ReplayCorpus, OverridesAreWhatTheFileNamesAndNoMore) {
     host::ParamValue(expected, "s_sensorBackFlag") = 1;
     host::ParamValue(expected, "_NAVI_range_mean.RANGE_LOW") = 7;
     EXPECT_EQ(params, expected);
-    EXPECT_EQ(overrides.size(), 3u);
+    EXPECT_EQ(overrides.size(), 3U);
 }
 
 }  // namespace

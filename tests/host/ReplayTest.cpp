@@ -36,7 +36,7 @@ TEST(Replay, AbsentFramesBeforeThePresentOnesDoNotEndTheGesture) {
 TEST(Replay, VotesAtTheFirstAbsentFrameAfterAPresentOne) {
     const ReplayResult result =
         ReplayHere(GestureBuilder(Mode::Fp).Skin(0).Skin(6).Empty().Skin(0).Skin(-9).Get());
-    EXPECT_EQ(result.calls.size(), 3u);
+    EXPECT_EQ(result.calls.size(), 3U);
     EXPECT_EQ(result.voteTimeOut, 0);
     EXPECT_EQ(result.pairs, 1);
     EXPECT_EQ(result.frameCount, 5);

@@ -22,7 +22,7 @@ constexpr int64_t kCorpusCount = 80;
 // FNV-1a over everything of a gesture that a replay or a judge reads.
 class Fnv {
   public:
-    void Byte(uint8_t byte) { hash_ = (hash_ ^ byte) * 0x100000001B3ULL; }
+    void Byte(uint8_t byte) { m_hash = (m_hash ^ byte) * 0x100000001B3ULL; }
 
     void Word(int64_t word) {
         auto bits = static_cast<uint64_t>(word);
@@ -32,18 +32,17 @@ class Fnv {
         }
     }
 
-    uint64_t Hash() const { return hash_; }
+    uint64_t Hash() const { return m_hash; }
 
   private:
-    uint64_t hash_ = 0xCBF29CE484222325ULL;
+    uint64_t m_hash = 0xCBF29CE484222325ULL;
 };
 
 uint64_t HashOf(const Gesture& gesture) {
     Fnv fnv;
     for (const RecordedFrame& frame : gesture.frames) {
-        for (const uint8_t byte : frame.raw) {
+        for (const uint8_t byte : frame.raw)
             fnv.Byte(byte);
-        }
         fnv.Word(frame.reg24);
         fnv.Word(frame.reg28);
         fnv.Word(frame.x16.value());
@@ -51,9 +50,8 @@ uint64_t HashOf(const Gesture& gesture) {
         fnv.Word(static_cast<int64_t>(frame.presence.value()));
     }
     fnv.Word(gesture.label.value_or(-1));
-    for (const int32_t key : gesture.accepted) {
+    for (const int32_t key : gesture.accepted)
         fnv.Word(key);
-    }
     return fnv.Hash();
 }
 
@@ -90,9 +88,8 @@ class SimCorpus : public testing::Test {
   protected:
     static std::vector<Gesture> Gestures() {
         std::vector<Gesture> gestures;
-        for (int64_t i = 0; i < kCorpusCount; ++i) {
+        for (int64_t i = 0; i < kCorpusCount; ++i)
             gestures.push_back(SimulateCorpusGesture(kSeed, i));
-        }
         return gestures;
     }
 };
@@ -120,18 +117,16 @@ TEST_F(SimCorpus, FramesSuitTheGeometry) {
         EXPECT_EQ(ParamValue(gesture.params, "s_modeFlag"), static_cast<int32_t>(gesture.mode));
         EXPECT_TRUE(gesture.geometry == GeometryOf(gesture.params)) << gesture.id;
         EXPECT_LE(gesture.frames.size(), 90U) << gesture.id;
-        for (const RecordedFrame& frame : gesture.frames) {
+        for (const RecordedFrame& frame : gesture.frames)
             ASSERT_EQ(frame.raw.size(), gesture.mode == Mode::Hg ? 40U * 48U : 56U * 36U);
-        }
     }
 }
 
 TEST_F(SimCorpus, RegistersOnlyWithDoubleScan) {
     for (const Gesture& gesture : Gestures()) {
         uint32_t bits = 0;
-        for (const RecordedFrame& frame : gesture.frames) {
+        for (const RecordedFrame& frame : gesture.frames)
             bits |= frame.reg24 | frame.reg28;
-        }
         EXPECT_EQ(bits != 0, gesture.mode == Mode::DoubleScan) << gesture.id;
     }
 }

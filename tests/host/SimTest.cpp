@@ -30,9 +30,8 @@ struct Scene {
 
 int32_t Mean(const std::vector<uint8_t>& greys) {
     int32_t sum = 0;
-    for (const uint8_t grey : greys) {
+    for (const uint8_t grey : greys)
         sum += grey;
-    }
     return sum / static_cast<int32_t>(greys.size());
 }
 
@@ -84,9 +83,8 @@ TEST(SimMath, GeneratorIsSplitMix64) {
 TEST(SimMath, RangeReachesBothEndsAndNoFurther) {
     SimRandom random(1);
     std::set<int32_t> seen;
-    for (int32_t i = 0; i < 200; ++i) {
+    for (int32_t i = 0; i < 200; ++i)
         seen.insert(random.Range(-2, 2));
-    }
     EXPECT_THAT(seen, testing::ElementsAre(-2, -1, 0, 1, 2));
 }
 
@@ -105,9 +103,8 @@ TEST(SimMath, NoiseHasTheDeviationAskedFor) {
 }
 
 TEST(SimMath, LatticeNoiseIsContinuous) {
-    for (int32_t x = -300; x < 300; ++x) {
+    for (int32_t x = -300; x < 300; ++x)
         EXPECT_NEAR(LatticeNoise(5, x, 9, 6), LatticeNoise(5, x + 1, 9, 6), 8) << x;
-    }
 }
 
 TEST(SimSkin, EqualSeedsGiveEqualSkinInAnyOrder) {
@@ -197,9 +194,8 @@ TEST(SenseSkin, MovesWithTheFinger) {
     const std::vector<SkinPoint> before = scene.At(0, 0);
     const std::vector<SkinPoint> after = scene.At(5 * 16, 2 * 16);
     for (size_t row = 2; row < 36; ++row) {
-        for (size_t column = 5; column < 56; ++column) {
+        for (size_t column = 5; column < 56; ++column)
             ASSERT_EQ(after[row * 56 + column].height, before[(row - 2) * 56 + column - 5].height);
-        }
     }
 }
 
@@ -228,9 +224,8 @@ TEST(GreyModel, LevelsSuitTheMode) {
 TEST(BlockOrder, BlocksFollowEachOther) {
     const Geometry geometry = GeometryOf(ParamsForMode(Mode::Fp, false));
     std::vector<uint8_t> picture(56 * 36);
-    for (size_t i = 0; i < picture.size(); ++i) {
+    for (size_t i = 0; i < picture.size(); ++i)
         picture[i] = static_cast<uint8_t>(i * 7 % 251);
-    }
     const std::vector<uint8_t> raw = ToBlockOrder(picture, geometry);
     EXPECT_EQ(raw[8], picture[56]);        // second row of the first block
     EXPECT_EQ(raw[16], picture[8]);        // first byte of the second block

@@ -12,7 +12,6 @@ namespace {
 
 using host::Store;
 using host_test::ErrorOf;
-using host_test::ExpectSameGesture;
 using host_test::NumberIn;
 using host_test::SmallGesture;
 using host_test::StoreOf;
@@ -110,7 +109,8 @@ TEST(StoreCreate, StoreThatIsBeingWrittenIsNotReplaced) {
 TEST(StoreCreate, OnlyOneOfManyCreatorsSucceeds) {
     const std::string path = TestDirectory() + "/s.db";
     std::vector<pid_t> children;
-    for (int i = 0; i < 8; ++i) {
+    children.reserve(8);
+    for (int i = 0; i < 8; ++i)
         children.push_back(host_test::InChild([&] {
             try {
                 Store::Create(path).Append(SmallGesture("g" + std::to_string(i)));
@@ -120,7 +120,6 @@ TEST(StoreCreate, OnlyOneOfManyCreatorsSucceeds) {
                                                                                               : 1;
             }
         }));
-    }
     int created = 0;
     for (const pid_t child : children) {
         const int status = host_test::StatusOf(child);

@@ -150,9 +150,8 @@ TEST(StoreOfVersion1, BecomesVersion2WhenOpenedForAppending) {
     EXPECT_EQ(NumberIn(path, "PRAGMA user_version"), 2);
     EXPECT_EQ(NumberIn(path, "SELECT count(*) FROM gesture WHERE checksum IS NULL"), 2);
     const Store store = Store::OpenForReading(path);
-    for (const char* id : {"a", "b", "c"}) {
+    for (const char* id : {"a", "b", "c"})
         ExpectSameGesture(store.Read(id), SmallGesture(id));
-    }
     RunSql(path, "UPDATE frame SET reg24 = 1 WHERE gesture = 3");
     EXPECT_THAT(ErrorOf([&] { store.Read("c"); }), HasSubstr("gesture 'c': its content has"));
 }

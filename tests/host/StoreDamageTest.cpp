@@ -101,9 +101,8 @@ TEST(StoreDamage, OverwrittenPagesNeverGiveAnUnsoundGesture) {
             WriteBytes(path, bytes);
             try {
                 Store::OpenForReading(path).ForEach([](const Gesture& gesture) {
-                    for (const host::RecordedFrame& frame : gesture.frames) {
+                    for (const host::RecordedFrame& frame : gesture.frames)
                         EXPECT_EQ(frame.raw.size(), 2016U);
-                    }
                 });
             } catch (const host::Error& error) {
                 EXPECT_THAT(error.what(), StartsWith(path + ": "));
@@ -191,9 +190,8 @@ TEST(StoreDamage, KilledWriterLeavesWholeGesturesAndAllThatWasReported) {
         for (int i = 0;; ++i) {
             store.Append(SmallGesture("g" + std::to_string(i), 20));
             const char done = 1;
-            if (write(channel[1], &done, 1) != 1) {
+            if (write(channel[1], &done, 1) != 1)
                 return 1;
-            }
         }
     });
     ASSERT_GT(child, 0);
@@ -220,9 +218,8 @@ TEST(StoreDamage, ProcessesThatAppendAtOnceLoseNothing) {
         children.push_back(InChild([&] {
             try {
                 // Opening and closing for each makes the processes meet in that, too.
-                for (int i = 0; i < kEach; ++i) {
+                for (int i = 0; i < kEach; ++i)
                     Store::OpenForAppending(path).Append(SmallGesture(name + std::to_string(i)));
-                }
             } catch (const host::Error& error) {
                 std::fprintf(stderr, "%s\n", error.what());
                 return 1;
@@ -230,9 +227,8 @@ TEST(StoreDamage, ProcessesThatAppendAtOnceLoseNothing) {
             return 0;
         }));
     }
-    for (const pid_t child : children) {
+    for (const pid_t child : children)
         EXPECT_EQ(StatusOf(child), 0);
-    }
     EXPECT_EQ(Store::OpenForReading(path).Count(), 3 * kEach);
 }
 
@@ -246,9 +242,8 @@ TEST(StoreDamage, FullDiskIsAnErrorAndLeavesWholeGestures) {
         setrlimit(RLIMIT_FSIZE, &limit);
         Store store = Store::OpenForAppending(path);
         try {
-            for (int i = 0; i < 100; ++i) {
+            for (int i = 0; i < 100; ++i)
                 store.Append(SmallGesture("g" + std::to_string(i), 20));
-            }
         } catch (const host::Error& error) {
             return error.File() == path ? kRefused : 1;
         }

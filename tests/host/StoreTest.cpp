@@ -19,7 +19,6 @@ using host_test::ErrorOf;
 using host_test::ExpectSameGesture;
 using host_test::NumberIn;
 using host_test::ReadBytes;
-using host_test::RunSql;
 using host_test::SmallGesture;
 using host_test::StoreOf;
 using host_test::TestDirectory;
@@ -105,9 +104,8 @@ TEST(Store, EqualParametersAreStoredOnce) {
 
 TEST(Store, ClosedStoreIsOneFile) {
     const std::string path = StoreOf({SmallGesture("a")});
-    for (const char* suffix : {"-wal", "-shm", "-journal"}) {
+    for (const char* suffix : {"-wal", "-shm", "-journal"})
         EXPECT_FALSE(std::filesystem::exists(path + suffix)) << suffix;
-    }
 }
 
 TEST(Store, AppendingGoesOnWhereItEnded) {
@@ -244,7 +242,7 @@ TEST(Redact, FramesBecomeTheirMeanAndTheRestStays) {
         EXPECT_EQ(std::count(raw.begin(), raw.end(), raw[0]), 56 * 36);
         expected.frames[i].raw = raw;
     }
-    expected.tags.push_back("redacted");
+    expected.tags.emplace_back("redacted");
     ExpectSameGesture(gesture, expected);
     host::Redact(gesture);
     EXPECT_EQ(gesture.tags.size(), expected.tags.size());
@@ -252,9 +250,8 @@ TEST(Redact, FramesBecomeTheirMeanAndTheRestStays) {
 
 TEST(RealRecordings, ComeBackFromAStore) {
     const std::string directory = host_test::RealDataDirectory();
-    if (directory.empty()) {
+    if (directory.empty())
         GTEST_SKIP() << "no real recordings: set FPNAVI_REALDATA to their directory";
-    }
     const std::vector<Gesture> gestures = host::ImportFng(directory + "/gestures");
     const std::string path = StoreOf(gestures);
     size_t index = 0;

@@ -17,9 +17,8 @@ namespace host_test {
 inline std::string StoreOf(const std::vector<host::Gesture>& gestures) {
     const std::string path = TestDirectory() + "/s.db";
     host::Store store = host::Store::Create(path);
-    for (const host::Gesture& gesture : gestures) {
+    for (const host::Gesture& gesture : gestures)
         store.Append(gesture);
-    }
     return path;
 }
 

@@ -15,7 +15,7 @@ _TESTED_IN = {
     'GreyHistogram': 'PreProcess', 'ShiftTest': 'FingerNoMove', 'Templates': 'FindCandidate',
     'PlacementDiffs': 'FindCandidate', 'TileMatch': 'ImgJoint', 'JointSearch': 'ImgJoint',
     'SetNaviParam': 'NaviParam', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
-    'NaviVoteInfo': 'Gesture',
+    'NaviVoteInfo': 'Gesture', 'NaviMode': 'NaviParam',
 }
 # Rooms that the step tests do not call.
 _NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneHistogram', 'TuneStep',

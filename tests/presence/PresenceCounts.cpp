@@ -66,18 +66,18 @@ TextureAnswer TextureTest(const std::vector<uint8_t>& picture) {
 
 // Prints the row of a group; true when all of its counts are high enough.
 bool Judge(const presence::FrameGroup& group) {
-    Counts texture, detector;
+    Counts texture;
+    Counts detector;
     int32_t weakestPresent = INT32_MAX;
     int32_t strongestAbsent = 0;
     for (const presence::KnownFrame& frame : group.frames) {
         const TextureAnswer answer = TextureTest(frame.picture);
         texture.Add(frame.present, answer.finger);
         detector.Add(frame.present, fpnavi::NavFingerDetectFp(frame.picture.data()) == 1);
-        if (frame.present) {
+        if (frame.present)
             weakestPresent = std::min(weakestPresent, answer.strongest);
-        } else {
+        else
             strongestAbsent = std::max(strongestAbsent, answer.strongest);
-        }
     }
     fmt::print("{:<16} | {:>22} {:>22} | {:>22} {:>22} | {:>7} {:>7}\n", group.name,
                texture.present.Text(), texture.absent.Text(), detector.present.Text(),
@@ -86,9 +86,8 @@ bool Judge(const presence::FrameGroup& group) {
 }
 
 std::string DirectoryOf(int argc, char** argv) {
-    if (argc > 1) {
+    if (argc > 1)
         return argv[1];
-    }
     const char* realData = std::getenv("FPNAVI_REALDATA");
     return std::string(realData != nullptr ? realData : FPNAVI_REALDATA_DEFAULT) + "/gestures";
 }
@@ -97,9 +96,8 @@ int Run(const std::string& directory) {
     host::ParamBlock params = host::DefaultParams();
     SetNaviParam(params.data());
     std::vector<presence::FrameGroup> groups = presence::RecordedGroups(directory);
-    for (const presence::FrameGroup& group : groups) {
+    for (const presence::FrameGroup& group : groups)
         fmt::print("{}: {}\n", group.name, group.fingers);
-    }
     groups.push_back(presence::SimulatedGroup(kSimulatedFrames));
 
     fmt::print("\n{:<16} | {:>45} | {:>45} | {:>15}\n", "frames told right", "texture test alone",
@@ -107,9 +105,8 @@ int Run(const std::string& directory) {
     fmt::print("{:<16} | {:>22} {:>22} | {:>22} {:>22} | {:>7} {:>7}\n", "", "present", "absent",
                "present", "absent", "present", "absent");
     bool enough = true;
-    for (const presence::FrameGroup& group : groups) {
+    for (const presence::FrameGroup& group : groups)
         enough = Judge(group) && enough;
-    }
     fmt::print(
         "\nresponse: the strongest block of the weakest touched and of the strongest empty "
         "frame; threshold {}\n",

@@ -15,21 +15,18 @@ namespace presence {
 namespace {
 
 void Append(std::vector<KnownFrame> from, std::vector<KnownFrame>& to) {
-    for (KnownFrame& frame : from) {
+    for (KnownFrame& frame : from)
         to.push_back(std::move(frame));
-    }
 }
 
 std::vector<KnownFrame> KnownFrames(const host::Gesture& gesture) {
     std::vector<KnownFrame> known;
-    if (gesture.geometry.Width() != kWidth || gesture.geometry.Height() != kHeight) {
+    if (gesture.geometry.Width() != kWidth || gesture.geometry.Height() != kHeight)
         return known;
-    }
     for (const host::RecordedFrame& frame : gesture.frames) {
-        if (frame.presence.has_value() && *frame.presence != host::Presence::Sliver) {
+        if (frame.presence.has_value() && *frame.presence != host::Presence::Sliver)
             known.push_back({host::FromBlockOrder(frame.raw, gesture.geometry),
                              *frame.presence == host::Presence::Present});
-        }
     }
     return known;
 }
@@ -42,19 +39,16 @@ std::vector<FrameGroup> RecordedGroups(const std::string& directory) {
     std::map<std::string, std::vector<KnownFrame>> framesOfFinger;  // in alphabetical order
     host::ImportFng(directory, [&](host::Gesture&& gesture) {
         const auto row = index.find(gesture.id);
-        if (row == index.end()) {
+        if (row == index.end())
             throw host::Error(indexPath, gesture.id, "expected a row for this recording");
-        }
         std::vector<KnownFrame> known = KnownFrames(gesture);
-        if (!known.empty()) {
+        if (!known.empty())
             Append(std::move(known), framesOfFinger[row->second.source]);
-        }
     });
-    if (framesOfFinger.size() < 2) {
+    if (framesOfFinger.size() < 2)
         throw host::Error(
             directory, "",
             fmt::format("expected {} x {} recordings of two fingers", kWidth, kHeight));
-    }
     std::vector<FrameGroup> groups = {{"first half", "", {}}, {"second half", "", {}}};
     size_t turn = 0;
     for (auto& [finger, frames] : framesOfFinger) {

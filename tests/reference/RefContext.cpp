@@ -77,9 +77,8 @@ void FpNaviClear() {
 }
 
 int32_t PairsOf(const NaviVoteInfo_t& info) {
-    if (info.calc_cnt < 0) {
+    if (info.calc_cnt < 0)
         return 0;
-    }
     return info.calc_cnt > kMaxPairs ? kMaxPairs : info.calc_cnt;
 }
 

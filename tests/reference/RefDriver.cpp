@@ -20,14 +20,12 @@ constexpr int64_t kMaxWork = int64_t{1} << 28;
 int64_t SaturatedProduct(std::initializer_list<int64_t> factors) {
     const int64_t most = INT64_MAX / 16;
     for (const int64_t factor : factors) {
-        if (factor < 1) {
+        if (factor < 1)
             return 0;
-        }
     }
     int64_t product = 1;
-    for (const int64_t factor : factors) {
+    for (const int64_t factor : factors)
         product = product > most / factor ? most : product * factor;
-    }
     return product;
 }
 
@@ -45,9 +43,8 @@ int64_t SearchWork() {
 }
 
 int64_t MatchWork() {
-    if (s_multiBloclkFlag == 1) {
+    if (s_multiBloclkFlag == 1)
         return SaturatedProduct({s_candidateNum, s_fullImageWidth, s_fullImageHeight});
-    }
     return SaturatedProduct({s_candidateNum, s_imageWidth, s_imageHeight});
 }
 
@@ -97,9 +94,8 @@ void RecordNoMove(int32_t n) {
 
 int32_t FinishFpPair(int32_t n) {
     const int32_t outcome = FingerNoMove(&s_imagePrev, &s_imageCurr);
-    if (outcome == kFingerFailed) {
+    if (outcome == kFingerFailed)
         return -1;
-    }
     if (outcome == kFingerNoMove) {
         RecordNoMove(n);
         return 0;
@@ -110,9 +106,8 @@ int32_t FinishFpPair(int32_t n) {
         s_voteInfo.vkey_fp[n] = VKEY_NONE;
         return 0;
     }
-    if (s_imagePrev.cvr < s_coverageMinFp || s_imageCurr.cvr < s_coverageMinFp) {
+    if (s_imagePrev.cvr < s_coverageMinFp || s_imageCurr.cvr < s_coverageMinFp)
         return 0;
-    }
     return CalcImgJoint();
 }
 
@@ -123,26 +118,21 @@ int32_t OrntCalcProcess() {
     if (n >= kMaxPairs) {
         return 0;  // the record is full; its entries stay as they are
     }
-    if (s_modeFlag != 1 && SearchWork() + MatchWork() + NoMoveWork() > kMaxWork) {
+    if (s_modeFlag != 1 && SearchWork() + MatchWork() + NoMoveWork() > kMaxWork)
         return -1;
-    }
-    if (GetCenterAndCoverage(&s_imagePrev) == -1 || GetCenterAndCoverage(&s_imageCurr) == -1) {
+    if (GetCenterAndCoverage(&s_imagePrev) == -1 || GetCenterAndCoverage(&s_imageCurr) == -1)
         return -1;
-    }
     if (s_doubleScanFlag == 1 &&
-        CalcDoubleScanMove(DoubleScanZonePrev, DoubleScanZoneCurr, &s_voteInfo) == -1) {
+        CalcDoubleScanMove(DoubleScanZonePrev, DoubleScanZoneCurr, &s_voteInfo) == -1)
         return -1;
-    }
-    if (s_imagePrev.cvr < s_coverageMinEff || s_imageCurr.cvr < s_coverageMinEff) {
+    if (s_imagePrev.cvr < s_coverageMinEff || s_imageCurr.cvr < s_coverageMinEff)
         return 0;
-    }
     CalcCenterMove(&s_imagePrev, &s_imageCurr, &s_voteInfo);
     RecordCentroids(n);
-    if (s_modeFlag == 1) {
+    if (s_modeFlag == 1)
         FinishHgPair(n);
-    } else if (FinishFpPair(n) == -1) {
+    else if (FinishFpPair(n) == -1)
         return -1;
-    }
     s_voteInfo.calc_cnt = n + 1;
     return 0;
 }
@@ -150,15 +140,12 @@ int32_t OrntCalcProcess() {
 namespace {
 
 bool AreSizesUsable() {
-    if (!IsUsableImage()) {
+    if (!IsUsableImage())
         return false;
-    }
-    if (s_modeFlag == 1) {
+    if (s_modeFlag == 1)
         return true;
-    }
-    if (s_candidateNum < 1 || s_candidateNum > 65536) {
+    if (s_candidateNum < 1 || s_candidateNum > 65536)
         return false;
-    }
     return s_multiBloclkFlag != 1 ||
            (IsSide(s_centerWidth + 2 * (int64_t{s_gapWidth} + s_boundWidth)) &&
             IsSide(s_centerHeight + 2 * (int64_t{s_gapHeight} + s_boundHeight)));
@@ -169,9 +156,8 @@ int32_t LoadCurrentFrame(const uint8_t* data) {
 }
 
 int32_t TakeFirstFrame(const uint8_t* data) {
-    if (LoadCurrentFrame(data) == -1) {
+    if (LoadCurrentFrame(data) == -1)
         return -1;
-    }
     if (ImgPreProcess(&s_imageCurr) == -1) {
         ImgClear(&s_imageCurr);
         return -1;
@@ -180,13 +166,11 @@ int32_t TakeFirstFrame(const uint8_t* data) {
 }
 
 int32_t TakeLaterFrame(const uint8_t* data) {
-    if (ImgCopy(&s_imagePrev, &s_imageCurr) == -1) {
+    if (ImgCopy(&s_imagePrev, &s_imageCurr) == -1)
         return -1;
-    }
     ImgClear(&s_imageCurr);
-    if (LoadCurrentFrame(data) == -1 || ImgPreProcess(&s_imageCurr) == -1) {
+    if (LoadCurrentFrame(data) == -1 || ImgPreProcess(&s_imageCurr) == -1)
         return -1;
-    }
     return OrntCalcProcess();
 }
 
@@ -200,22 +184,17 @@ int32_t DropBothFrames() {
 
 // data_prev only has to be non-null: the previous frame is the module's own.
 int32_t OrientationCalc(const uint8_t* data_prev, const uint8_t* data_curr, int32_t time_out) {
-    if (s_logShowFlag == 1) {
+    if (s_logShowFlag == 1)
         LogLine("OrientationCalc", 328, "TQCODE - OrientationCalc - Navi.ver.01.07.10!\n");
-    }
-    if (data_prev == nullptr || data_curr == nullptr) {
+    if (data_prev == nullptr || data_curr == nullptr)
         return -1;
-    }
-    if (s_lastFrameFlag == 1 || time_out == 1) {
+    if (s_lastFrameFlag == 1 || time_out == 1)
         return 0;
-    }
     s_frameNum = WrapAdd32(s_frameNum, 1);
-    if (!AreSizesUsable()) {
+    if (!AreSizesUsable())
         return DropBothFrames();
-    }
-    if (s_frameNum == 1) {
+    if (s_frameNum == 1)
         return TakeFirstFrame(data_curr);
-    }
     return TakeLaterFrame(data_curr) == -1 ? DropBothFrames() : 0;
 }
 

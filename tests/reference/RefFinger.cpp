@@ -35,9 +35,8 @@ uint8_t BlockPixel(const uint8_t* image, const BlockGrid& grid, int32_t k, int32
 int32_t BlockMean(const uint8_t* image, const BlockGrid& grid, int32_t k) {
     int32_t sum = 0;
     for (int32_t row = 0; row < grid.blkHeight; ++row) {
-        for (int32_t column = 0; column < grid.blkWidth; ++column) {
+        for (int32_t column = 0; column < grid.blkWidth; ++column)
             sum = WrapAdd32(sum, BlockPixel(image, grid, k, row, column));
-        }
     }
     return sum / WrapMul32(grid.blkWidth, grid.blkHeight);
 }
@@ -49,9 +48,8 @@ int32_t DoubleScanFingerDetect(const uint8_t* DoubleScanZone) {
     const int32_t height = 8;
     int32_t count = 0;
     for (int32_t cell = 0; cell < width * height; ++cell) {
-        if (DoubleScanZone[cell] == 1) {
+        if (DoubleScanZone[cell] == 1)
             ++count;
-        }
     }
     return count * 100 / (width * height);
 }
@@ -60,26 +58,22 @@ int32_t DoubleScanFingerDetect(const uint8_t* DoubleScanZone) {
 int32_t GetBlkMeanMin(const uint8_t* p_data, int32_t* blk_mean_min) {
     const BlockGrid grid = MakeGrid(2, 2);
     int32_t min = 256;
-    for (int32_t k = 0; k < grid.blkNum && HasBlockPixels(grid); ++k) {
+    for (int32_t k = 0; k < grid.blkNum && HasBlockPixels(grid); ++k)
         min = Min32(min, BlockMean(p_data, grid, k));
-    }
     *blk_mean_min = min;
     return 0;
 }
 
 int32_t NavFingerDetectHg(const uint8_t* p_data) {
-    if (!IsUsableImage() || !IsSide(s_imageWidthHg) || !IsSide(s_imageHeightHg)) {
+    if (!IsUsableImage() || !IsSide(s_imageWidthHg) || !IsSide(s_imageHeightHg))
         return -1;
-    }
     const int32_t imgSize = s_imageWidthHg * s_imageHeightHg;
     int32_t sum = 0;  // wraps beyond 2^23 white pixels
-    for (int32_t p = 0; p < imgSize; ++p) {
+    for (int32_t p = 0; p < imgSize; ++p)
         sum = WrapAdd32(sum, p_data[p]);
-    }
     const int32_t mean = sum / imgSize;
-    if (mean <= s_meanThreshold) {
+    if (mean <= s_meanThreshold)
         return 1;
-    }
     if (s_highSensitiveMode == 1) {
         int32_t blkMeanMin = 0;
         GetBlkMeanMin(p_data, &blkMeanMin);
@@ -121,12 +115,10 @@ void FindGreyEnds(const int32_t (&hist)[256], int32_t lowLimit, int32_t highLimi
         cumHist[i] = cumHist[i - 1] + hist[i];
         const int32_t before = WrapMul32(100, cumHist[i - 1]);
         const int32_t here = WrapMul32(100, cumHist[i]);
-        if (before <= lowLimit && here > lowLimit) {
+        if (before <= lowLimit && here > lowLimit)
             ends->iLow = i - 1;
-        }
-        if (before < highLimit && here >= highLimit) {
+        if (before < highLimit && here >= highLimit)
             ends->iHigh = i;
-        }
     }
 }
 
@@ -134,9 +126,8 @@ void FindGreyEnds(const int32_t (&hist)[256], int32_t lowLimit, int32_t highLimi
 
 // The ends are carried from block to block on purpose.
 int32_t GetGreyRange(const uint8_t* buffer, int32_t* range) {
-    if (buffer == nullptr || range == nullptr) {
+    if (buffer == nullptr || range == nullptr)
         return -1;
-    }
     const BlockGrid grid = MakeGrid(4, 4);
     const int32_t blkSize = WrapMul32(grid.blkWidth, grid.blkHeight);
     const int32_t lowLimit = WrapMul32(blkSize, s_cutOffPercent);
@@ -146,9 +137,8 @@ int32_t GetGreyRange(const uint8_t* buffer, int32_t* range) {
     for (int32_t k = 0; k < grid.blkNum; ++k) {
         int32_t hist[256] = {};
         for (int32_t row = 0; row < grid.blkHeight; ++row) {
-            for (int32_t column = 0; column < grid.blkWidth; ++column) {
+            for (int32_t column = 0; column < grid.blkWidth; ++column)
                 ++hist[BlockPixel(buffer, grid, k, row, column)];
-            }
         }
         FindGreyEnds(hist, lowLimit, highLimit, &ends);
         max = Max32(max, ends.iHigh - ends.iLow);
@@ -160,24 +150,21 @@ int32_t GetGreyRange(const uint8_t* buffer, int32_t* range) {
 // Without any geometry (both sides 0) the tests run on an empty image.
 int32_t NavFingerDetectFp(const uint8_t* p_data) {
     const bool noGeometryYet = s_imageWidth == 0 && s_imageHeight == 0;
-    if (!noGeometryYet && !IsUsableImage()) {
+    if (!noGeometryYet && !IsUsableImage())
         return -1;
-    }
     const int32_t blockNum = 5;
     int32_t fftRes[2 * blockNum] = {0, 0, 0, 0, 0, 255, 255, 255, 255, 255};
     FingerBLKTest(p_data, s_imageWidth, s_imageHeight, fftRes, 0);
     int32_t pressedBlkNum = 0;
     for (int32_t i = 0; i < blockNum; ++i) {
-        if (fftRes[i] >= s_fftResThreshold || fftRes[blockNum + i] < s_meanThresholdFp) {
+        if (fftRes[i] >= s_fftResThreshold || fftRes[blockNum + i] < s_meanThresholdFp)
             ++pressedBlkNum;
-        }
     }
     int32_t blkMeanDiff = 0;
     GetBlkMeanDiff(p_data, &blkMeanDiff);
     int32_t greyRange = 0;
-    if (GetGreyRange(p_data, &greyRange) == -1) {
+    if (GetGreyRange(p_data, &greyRange) == -1)
         return -1;
-    }
     const bool finger =
         pressedBlkNum > 0 || blkMeanDiff >= s_blkMeanDiffThreshold || greyRange >= s_rangeThreshold;
     return finger ? 1 : 0;
@@ -192,22 +179,19 @@ int32_t DetectByDoubleScan() {
 }
 
 int32_t DetectByMode(const uint8_t* p_data) {
-    if (s_doubleScanFlag == 1) {
+    if (s_doubleScanFlag == 1)
         return DetectByDoubleScan();
-    }
     return s_modeFlag == 1 ? NavFingerDetectHg(p_data) : NavFingerDetectFp(p_data);
 }
 
 }  // namespace
 
 int32_t vmk_fp_navigation_detect_finger_status(const uint8_t* p_data) {
-    if (p_data == nullptr) {
+    if (p_data == nullptr)
         return -1;
-    }
     const int32_t finger = DetectByMode(p_data);
-    if (finger != -1) {
+    if (finger != -1)
         s_lastFrameFlag = finger == 1 ? 0 : 1;
-    }
     return finger;
 }
 

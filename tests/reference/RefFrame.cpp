@@ -32,9 +32,8 @@ bool AllocateBuffers(NaviFrame_t* img, int64_t size) {
 
 // 0, 1 or 2: the band of a position along an axis cut into bound, center, bound.
 int32_t BandOf(int32_t position, int32_t bound, int32_t center) {
-    if (position < bound) {
+    if (position < bound)
         return 0;
-    }
     return position < bound + center ? 1 : 2;
 }
 
@@ -42,13 +41,11 @@ int32_t BandOf(int32_t position, int32_t bound, int32_t center) {
 
 int32_t ImgInit(NaviFrame_t* img, int32_t i_start, int32_t i_end, int32_t j_start, int32_t j_end,
                 const uint8_t* data) {
-    if (img == nullptr || data == nullptr || i_end <= i_start || j_end <= j_start) {
+    if (img == nullptr || data == nullptr || i_end <= i_start || j_end <= j_start)
         return -1;
-    }
     if (i_start < 0 || j_start < 0 || i_start > s_imageHeight || i_end > s_imageHeight ||
-        j_start > s_imageWidth || j_end > s_imageWidth) {
+        j_start > s_imageWidth || j_end > s_imageWidth)
         return -1;
-    }
     ReleaseBuffers(img);
     const int32_t height = i_end - i_start;
     const int32_t width = j_end - j_start;
@@ -74,9 +71,8 @@ int32_t ImgInit(NaviFrame_t* img, int32_t i_start, int32_t i_end, int32_t j_star
 }
 
 void ImgClear(NaviFrame_t* img) {
-    if (img == nullptr) {
+    if (img == nullptr)
         return;
-    }
     ReleaseBuffers(img);
     img->height = 0;
     img->width = 0;
@@ -88,17 +84,15 @@ void ImgClear(NaviFrame_t* img) {
 
 int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src) {
     if (img_dst == nullptr || img_src == nullptr || img_src->pData == nullptr ||
-        img_src->pType == nullptr || img_src->height <= 0 || img_src->width <= 0) {
+        img_src->pType == nullptr || img_src->height <= 0 || img_src->width <= 0)
         return -1;
-    }
     ReleaseBuffers(img_dst);
     img_dst->height = img_src->height;
     img_dst->width = img_src->width;
     const int64_t size = int64_t{img_src->width} * img_src->height;
     img_dst->pData = static_cast<uint8_t*>(Allocate(size));
-    if (img_dst->pData == nullptr) {
+    if (img_dst->pData == nullptr)
         return -1;
-    }
     img_dst->pType = static_cast<uint8_t*>(Allocate(size));
     if (img_dst->pType == nullptr) {
         ReleaseBuffers(img_dst);
@@ -117,9 +111,8 @@ namespace {
 
 // Whether a source side is the sum of its three tiles and the spread side fits 32 bits.
 bool TilesFit(int32_t side, int32_t bound, int32_t center, int32_t gap) {
-    if (bound < 0 || center < 0 || gap < 0) {
+    if (bound < 0 || center < 0 || gap < 0)
         return false;
-    }
     const int64_t tiles = int64_t{center} + 2 * int64_t{bound};
     return side == tiles && tiles + 2 * int64_t{gap} <= INT32_MAX;
 }
@@ -142,13 +135,11 @@ void PlaceTiles(const NaviFrame_t* img, NaviFrame_t* full_img) {
 
 // cvr, range, xc and yc of the destination keep their values.
 int32_t GetFullImg(const NaviFrame_t* img, NaviFrame_t* full_img) {
-    if (img == nullptr || full_img == nullptr || img->pData == nullptr || img->pType == nullptr) {
+    if (img == nullptr || full_img == nullptr || img->pData == nullptr || img->pType == nullptr)
         return -1;
-    }
     if (!TilesFit(img->width, s_boundWidth, s_centerWidth, s_gapWidth) ||
-        !TilesFit(img->height, s_boundHeight, s_centerHeight, s_gapHeight)) {
+        !TilesFit(img->height, s_boundHeight, s_centerHeight, s_gapHeight))
         return -1;
-    }
     full_img->width = s_centerWidth + 2 * (s_boundWidth + s_gapWidth);
     full_img->height = s_centerHeight + 2 * (s_boundHeight + s_gapHeight);
     ReleaseBuffers(full_img);

@@ -74,17 +74,14 @@ int32_t FindMatch(int32_t* candidate_di, int32_t* candidate_dj, int32_t* dx, int
 namespace {
 
 int32_t MatchVerdict(int32_t dx, int32_t dy, int32_t diff) {
-    if (diff > s_diffThresholdStr) {
+    if (diff > s_diffThresholdStr)
         return VKEY_NONE;
-    }
     const int32_t ax = WrapAbs32(dx);
     const int32_t ay = WrapAbs32(dy);
-    if (Max32(ax, ay) < s_singleMoveThreshold) {
+    if (Max32(ax, ay) < s_singleMoveThreshold)
         return VKEY_NO_MOVE;
-    }
-    if (ax > ay) {
+    if (ax > ay)
         return dx <= 0 ? VKEY_LEFT : VKEY_RIGHT;
-    }
     return dy <= 0 ? VKEY_DOWN : VKEY_UP;
 }
 
@@ -106,14 +103,12 @@ int32_t PrepareMatch(int32_t* candidate_i, int32_t* candidate_j) {
         candidate_i[i] = 0;
         candidate_j[i] = 0;
     }
-    if (FindCandidate(candidate_i, candidate_j) == -1) {
+    if (FindCandidate(candidate_i, candidate_j) == -1)
         return -1;
-    }
     if (s_multiBloclkFlag == 1) {
         if (GetFullImg(&s_imagePrev, &s_fullImagePrev) == -1 ||
-            GetFullImg(&s_imageCurr, &s_fullImageCurr) == -1) {
+            GetFullImg(&s_imageCurr, &s_fullImageCurr) == -1)
             return -1;
-        }
     }
     return 0;
 }

@@ -10,13 +10,13 @@
 
 namespace reference {
 
+// Calls itself once a level, at most 17 times for the largest list.
+// NOLINTNEXTLINE(misc-no-recursion)
 int32_t MaxHeapify(uint32_t* arr, int32_t len, int32_t i) {
-    if (arr == nullptr || len < 1) {
+    if (arr == nullptr || len < 1)
         return -1;
-    }
-    if (i >= len) {
+    if (i >= len)
         return 0;
-    }
     const int64_t left = 2 * int64_t{i} + 1;
     const int64_t right = left + 1;
     int64_t max = i;
@@ -29,9 +29,8 @@ int32_t MaxHeapify(uint32_t* arr, int32_t len, int32_t i) {
         max = right;
         max_val = arr[right];
     }
-    if (max == i) {
+    if (max == i)
         return 0;
-    }
     arr[max] = arr[i];
     arr[i] = max_val;
     return MaxHeapify(arr, len, Wrap32(max)) == -1 ? -1 : 0;
@@ -81,9 +80,8 @@ struct FramePair {
 
 // Ties cut the templates from the current frame.
 FramePair ChooseFrames() {
-    if (s_imageCurr.cvr > s_imagePrev.cvr) {
+    if (s_imageCurr.cvr > s_imagePrev.cvr)
         return {&s_imagePrev, &s_imageCurr};
-    }
     return {&s_imageCurr, &s_imagePrev};
 }
 
@@ -105,9 +103,8 @@ bool IsValidTemplate(const MatchTemplate& tplt, const uint8_t* pt1, int32_t tplt
     int32_t cnt = 0;
     for (int32_t m = 0; m < tplt.tpltHeight; ++m) {
         for (int32_t n = 0; n < tplt.tpltWidth; ++n) {
-            if (pt1[(tplt.tplt_i0 + m) * s_imageWidth + tplt.tplt_j0 + n] == 1) {
+            if (pt1[(tplt.tplt_i0 + m) * s_imageWidth + tplt.tplt_j0 + n] == 1)
                 ++cnt;
-            }
         }
     }
     return WrapMul32(100, cnt) / tpltSize > 49;
@@ -147,12 +144,10 @@ uint32_t PackCandidate(int32_t diff, int32_t i, int32_t j, int32_t k) {
 int32_t SearchTemplate(const MatchTemplate& tplt, int32_t k, const FramePair& frames,
                        int32_t tpltSize, uint32_t* candidateList) {
     const SearchRange range = PlacementsOf(tplt);
-    if (IsEmpty(range)) {
+    if (IsEmpty(range))
         return 0;
-    }
-    if (!AllPlacementsFit(range, tplt)) {
+    if (!AllPlacementsFit(range, tplt))
         return -1;
-    }
     for (int32_t i = Wrap32(range.firstRow); i <= range.lastRow; ++i) {
         for (int32_t j = Wrap32(range.firstColumn); j <= range.lastColumn; ++j) {
             const int32_t diff = PlacementDifference(tplt, i, j, frames.templateFrame->pData,
@@ -160,9 +155,8 @@ int32_t SearchTemplate(const MatchTemplate& tplt, int32_t k, const FramePair& fr
             const uint32_t candidate = PackCandidate(diff, i, j, k);
             if (candidate < candidateList[0]) {
                 candidateList[0] = candidate;
-                if (MaxHeapify(candidateList, s_candidateNum, 0) == -1) {
+                if (MaxHeapify(candidateList, s_candidateNum, 0) == -1)
                     return -1;
-                }
             }
         }
     }
@@ -174,20 +168,17 @@ int32_t SearchAllTemplates(const MatchTemplate (&templates)[kTemplateNum], int32
     const FramePair frames = ChooseFrames();
     int32_t tpltValidFlag[kTemplateNum] = {};
     for (int32_t k = 0; k < s_tpltNum; ++k) {
-        if (!HasPixels(templates[k])) {
+        if (!HasPixels(templates[k]))
             continue;
-        }
-        if (!LiesInFrame(templates[k])) {
+        if (!LiesInFrame(templates[k]))
             return -1;
-        }
         tpltValidFlag[k] =
             IsValidTemplate(templates[k], frames.templateFrame->pType, tpltSize) ? 1 : 0;
     }
     for (int32_t k = 0; k < s_tpltNum; ++k) {
         if (tpltValidFlag[k] == 1 &&
-            SearchTemplate(templates[k], k, frames, tpltSize, candidateList) == -1) {
+            SearchTemplate(templates[k], k, frames, tpltSize, candidateList) == -1)
             return -1;
-        }
     }
     return 0;
 }
@@ -210,23 +201,20 @@ void ConvertCandidates(const MatchTemplate (&templates)[kTemplateNum],
 
 int32_t FindCandidate(int32_t* candidate_di, int32_t* candidate_dj) {
     const int32_t tpltSize = WrapMul32(s_templateHeight, s_templateWidth);
-    if (tpltSize < 1) {
+    if (tpltSize < 1)
         return -1;
-    }
     MatchTemplate templates[kTemplateNum];
     BuildTemplates(templates);
     const int64_t bytes = int64_t{s_candidateNum} * static_cast<int64_t>(sizeof(uint32_t));
     uint32_t* candidateList = static_cast<uint32_t*>(Allocate(bytes));
-    if (candidateList == nullptr) {
+    if (candidateList == nullptr)
         return -1;
-    }
     for (int32_t m = 0; m < s_candidateNum; ++m) {
         candidateList[m] = 0xFF000000U;  // difference 255 at row 0, column 0, template 0
     }
     const int32_t result = SearchAllTemplates(templates, tpltSize, candidateList);
-    if (result == 0) {
+    if (result == 0)
         ConvertCandidates(templates, candidateList, candidate_di, candidate_dj);
-    }
     std::free(candidateList);
     return result;
 }

@@ -10,9 +10,8 @@ namespace reference {
 
 int32_t GetCenterAndCoverage(NaviFrame_t* img) {
     if (img == nullptr || img->pType == nullptr || img->pData == nullptr || img->width < 1 ||
-        img->height < 1) {
+        img->height < 1)
         return -1;
-    }
     const int64_t width = img->width;
     const int64_t height = img->height;
     const int64_t size = width * height;
@@ -43,9 +42,8 @@ namespace {
 // A change of coverage that is large against the travel: the finger is pressed or lifted, it does
 // not slide. Without travel nothing is claimed.
 bool IsDeformed(int32_t dcvr, int32_t travel) {
-    if (s_modeFlag != 1 || travel == 0) {
+    if (s_modeFlag != 1 || travel == 0)
         return false;
-    }
     const int32_t deform_rate = WrapDiv32(dcvr, travel);
     return WrapAbs32(deform_rate) > s_deformThreshold;
 }
@@ -103,15 +101,12 @@ int32_t CalcDoubleScanMove(const uint8_t* pPrev, const uint8_t* pCurr, NaviVoteI
     int32_t yc_cvrr = 0;
     int32_t cvr_cvrr = 0;
     const int32_t calc_cnt = PairsOf(*voteInfo);
-    if (DoubleScanGetCenterAndCoverage(pPrev, &xc_prev, &yc_prev, &cvr_prev) == -1) {
+    if (DoubleScanGetCenterAndCoverage(pPrev, &xc_prev, &yc_prev, &cvr_prev) == -1)
         return -1;
-    }
-    if (DoubleScanGetCenterAndCoverage(pCurr, &xc_cvrr, &yc_cvrr, &cvr_cvrr) == -1) {
+    if (DoubleScanGetCenterAndCoverage(pCurr, &xc_cvrr, &yc_cvrr, &cvr_cvrr) == -1)
         return -1;
-    }
-    if (calc_cnt >= kMaxPairs) {
+    if (calc_cnt >= kMaxPairs)
         return -1;  // the current frame has no entry any more
-    }
     voteInfo->xc_ds[calc_cnt] = xc_prev;
     voteInfo->yc_ds[calc_cnt] = yc_prev;
     voteInfo->cvr_ds[calc_cnt] = cvr_prev;
@@ -172,20 +167,16 @@ void CompareBlock(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr,
     const int32_t j_start_prev = WrapAdd32(blocks.j_start_block[k], Max32(WrapNeg32(dc), 0));
     const int32_t j_start_curr = WrapAdd32(blocks.j_start_block[k], Max32(dc, 0));
     if (!StartsInside(i_start_prev, height) || !StartsInside(i_start_curr, height) ||
-        !StartsInside(j_start_prev, width) || !StartsInside(j_start_curr, width)) {
+        !StartsInside(j_start_prev, width) || !StartsInside(j_start_curr, width))
         return;
-    }
     const int32_t row_range = WrapSub32(blocks.blk_height[k], WrapAbs32(dr));
     const int32_t col_range = WrapSub32(blocks.blk_width[k], WrapAbs32(dc));
-    if (row_range <= 0 || col_range <= 0) {
+    if (row_range <= 0 || col_range <= 0)
         return;
-    }
     if (!RunsInside(i_start_prev, row_range, height) ||
         !RunsInside(i_start_curr, row_range, height) ||
-        !RunsInside(j_start_prev, col_range, width) ||
-        !RunsInside(j_start_curr, col_range, width)) {
+        !RunsInside(j_start_prev, col_range, width) || !RunsInside(j_start_curr, col_range, width))
         return;
-    }
     for (int32_t r = 0; r < row_range; ++r) {
         for (int32_t c = 0; c < col_range; ++c) {
             // The starts cross over: the previous frame is read at the "curr" start.
@@ -210,9 +201,8 @@ bool AreComparable(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
 }  // namespace
 
 int32_t FingerNoMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
-    if (!AreComparable(img_prev, img_curr)) {
+    if (!AreComparable(img_prev, img_curr))
         return kFingerFailed;
-    }
     const NoMoveBlocks blocks = CutBlocks(img_prev->width, img_prev->height);
     const int64_t dr_max = s_smallMoveTolRow;
     const int64_t dc_max = s_smallMoveTolCol;
@@ -221,18 +211,15 @@ int32_t FingerNoMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
         for (int64_t dc = -dc_max; dc <= dc_max; ++dc) {
             Overlap overlap = {0, 0};
             for (int32_t k = 0; k < kBlockNum; ++k) {
-                if (WrapMul32(blocks.blk_width[k], blocks.blk_height[k]) != 0) {
+                if (WrapMul32(blocks.blk_width[k], blocks.blk_height[k]) != 0)
                     CompareBlock(img_prev, img_curr, blocks, k, Wrap32(dr), Wrap32(dc), &overlap);
-                }
             }
-            if (overlap.overlap_area > 0 && overlap.overlap_area >= s_overlapAreaMinNoMove) {
+            if (overlap.overlap_area > 0 && overlap.overlap_area >= s_overlapAreaMinNoMove)
                 min = Min32(min, overlap.sum / overlap.overlap_area);
-            }
         }
     }
-    if (min < s_diffThresholdTol) {
+    if (min < s_diffThresholdTol)
         return kFingerNoMove;
-    }
     return min == 256 ? kFingerUndetermined : kFingerMoved;
 }
 

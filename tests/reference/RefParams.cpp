@@ -213,9 +213,8 @@ void SelectBlockGeometry() {
     s_blockWidth = s_blockWidthFp;
     s_blockColNum = s_blockColNumFp;
     s_blockRowNum = s_blockRowNumFp;
-    if (s_modeFlag == 2) {
+    if (s_modeFlag == 2)
         s_doubleScanFlag = 1;
-    }
 }
 
 // center + 2 * (gap + bound), the side of the image with the nine tiles spread apart.
@@ -252,9 +251,8 @@ void StoreParams(const int32_t* params) {
 }
 
 int32_t SetNaviParam(const int32_t* params) {
-    if (params == nullptr) {
+    if (params == nullptr)
         return -1;
-    }
     StoreParams(params);
     SelectBlockGeometry();
     DeriveSizes();

@@ -44,9 +44,8 @@ GreyClass MeasureClass(const ByteHistogram& hist, int32_t first, int32_t last) {
         greys.count += hist.count[i];
         sum += i * hist.count[i];
     }
-    if (greys.count != 0) {
+    if (greys.count != 0)
         greys.mean = sum / greys.count;
-    }
     return greys;
 }
 
@@ -59,13 +58,11 @@ int32_t WeightedSquare(const GreyClass& greys, int32_t mean) {
 
 int32_t CalcBiThr(const NaviFrame_t* img, int32_t* thr, int32_t* scale) {
     if (img == nullptr || img->pType == nullptr || img->pData == nullptr || thr == nullptr ||
-        scale == nullptr) {
+        scale == nullptr)
         return -1;
-    }
     const int32_t size = WrapMul32(img->width, img->height);
-    if (size <= 0) {
+    if (size <= 0)
         return -1;
-    }
     const ByteHistogram hist = CountGreys(img, size);
     int32_t max = 0;
     int32_t target = 0;
@@ -98,12 +95,10 @@ void FillBetween(uint8_t* type, int32_t length, int32_t step, int32_t maxLen) {
             idxMax = i;
         }
     }
-    if (idxMax == -1 || idxMin == maxLen) {
+    if (idxMax == -1 || idxMin == maxLen)
         return;
-    }
-    for (int32_t i = idxMin; i <= idxMax; ++i) {
+    for (int32_t i = idxMin; i <= idxMax; ++i)
         type[int64_t{i} * step] = 1;
-    }
 }
 
 }  // namespace
@@ -112,16 +107,13 @@ void GetFingerRidge(NaviFrame_t* img, int32_t thr) {
     const int32_t width = img->width;
     const int32_t height = img->height;
     const int32_t maxLen = Max32(width, height);
-    for (int64_t p = 0; p < int64_t{width} * height; ++p) {
+    for (int64_t p = 0; p < int64_t{width} * height; ++p)
         img->pType[p] = img->pData[p] <= thr ? 1 : 0;
-    }
     for (int32_t pass = 0; pass < 2; ++pass) {
-        for (int32_t row = 0; row < height; ++row) {
+        for (int32_t row = 0; row < height; ++row)
             FillBetween(img->pType + int64_t{row} * width, width, 1, maxLen);
-        }
-        for (int32_t column = 0; column < width; ++column) {
+        for (int32_t column = 0; column < width; ++column)
             FillBetween(img->pType + column, height, width, maxLen);
-        }
     }
 }
 
@@ -143,9 +135,8 @@ int32_t AccumulateFingerGreys(const NaviFrame_t* img, int32_t size, int32_t (&cu
         }
     }
     cumHist[0] = hist[0];
-    for (int32_t i = 1; i < 256; ++i) {
+    for (int32_t i = 1; i < 256; ++i)
         cumHist[i] = cumHist[i - 1] + hist[i];
-    }
     return cnt;
 }
 
@@ -157,12 +148,10 @@ GreySpan FindSpan(const int32_t (&cumHist)[256], int32_t cnt) {
     for (int32_t i = 1; i <= 255; ++i) {
         const int32_t before = WrapMul32(100, cumHist[i - 1]);
         const int32_t here = WrapMul32(100, cumHist[i]);
-        if (before <= lo && here > lo) {
+        if (before <= lo && here > lo)
             span.min = i - 1;
-        }
-        if (before < hi && here >= hi) {
+        if (before < hi && here >= hi)
             span.max = i;
-        }
     }
     return span;
 }
@@ -170,20 +159,17 @@ GreySpan FindSpan(const int32_t (&cumHist)[256], int32_t cnt) {
 }  // namespace
 
 int32_t StretchRange(NaviFrame_t* img, uint8_t scale) {
-    if (img == nullptr || img->pType == nullptr || img->pData == nullptr) {
+    if (img == nullptr || img->pType == nullptr || img->pData == nullptr)
         return -1;
-    }
     const int32_t size = WrapMul32(img->width, img->height);
-    if (size < 1) {
+    if (size < 1)
         return -1;
-    }
     int32_t cumHist[256] = {};
     const int32_t cnt = AccumulateFingerGreys(img, size, cumHist);
     const GreySpan span = FindSpan(cumHist, cnt);
     const int32_t range = span.max - span.min;
-    if (range < 1) {
+    if (range < 1)
         return 0;
-    }
     for (int32_t p = 0; p < size; ++p) {
         if (img->pType[p] == 1) {
             const int32_t value = (img->pData[p] - span.min) * scale / range;
@@ -198,21 +184,18 @@ int32_t StretchRange(NaviFrame_t* img, uint8_t scale) {
 int32_t ImgPreProcess(NaviFrame_t* img) {
     const uint8_t meanThr = 128;
     if (s_modeFlag == 1) {
-        for (int64_t p = 0; p < int64_t{s_imageHeight} * s_imageWidth; ++p) {
+        for (int64_t p = 0; p < int64_t{s_imageHeight} * s_imageWidth; ++p)
             img->pType[p] = img->pData[p] <= meanThr ? 1 : 0;
-        }
         return 0;
     }
     int32_t thr = 0;
     int32_t scale = 0;
-    if (CalcBiThr(img, &thr, &scale) == -1) {
+    if (CalcBiThr(img, &thr, &scale) == -1)
         return -1;
-    }
     img->range = static_cast<uint8_t>(scale);  // at most 254
     if (thr < 256 && img->pData != nullptr && img->pType != nullptr && img->width >= 1 &&
-        img->height >= 1) {
+        img->height >= 1)
         GetFingerRidge(img, thr);
-    }
     return StretchRange(img, 255) == -1 ? -1 : 0;
 }
 

@@ -19,9 +19,8 @@ bool IsBlockGridConsistent() {
 // Replaces the first `width` bytes by the ones that follow them, inside the image only.
 void CopySecondRowUp(int32_t width, uint8_t* image) {
     const int64_t size = int64_t{s_imageWidth} * s_imageHeight;
-    for (int64_t i = 0; i < width && width + i < size; ++i) {
+    for (int64_t i = 0; i < width && width + i < size; ++i)
         image[i] = image[width + i];
-    }
 }
 
 }  // namespace
@@ -29,12 +28,10 @@ void CopySecondRowUp(int32_t width, uint8_t* image) {
 // `height` is not used: the geometry is the parameter block's.
 int32_t GetNaviBlock(const uint8_t* p_data_origin, int32_t width, int32_t /*height*/,
                      uint8_t* p_data_resort) {
-    if (p_data_origin == nullptr || p_data_resort == nullptr) {
+    if (p_data_origin == nullptr || p_data_resort == nullptr)
         return -1;
-    }
-    if (!IsUsableImage() || !IsBlockGridConsistent()) {
+    if (!IsUsableImage() || !IsBlockGridConsistent())
         return -1;
-    }
     const int32_t blkSize = s_blockHeight * s_blockWidth;
     const int32_t blkNum = s_blockRowNum * s_blockColNum;
     for (int32_t b = 0; b < blkNum; ++b) {
@@ -44,9 +41,8 @@ int32_t GetNaviBlock(const uint8_t* p_data_origin, int32_t width, int32_t /*heig
             p_data_resort[s_imageWidth * row + column] = p_data_origin[b * blkSize + k];
         }
     }
-    if (s_directionControlFlag == 1 && s_modeFlag == 2) {
+    if (s_directionControlFlag == 1 && s_modeFlag == 2)
         CopySecondRowUp(width, p_data_resort);
-    }
     return 0;
 }
 
@@ -68,9 +64,8 @@ int32_t GetDoubleScanNaviBlock(uint32_t gReg24, uint32_t gReg28) {
 
 int32_t DoubleScanGetCenterAndCoverage(const uint8_t* DoubleScanZone, int32_t* xc, int32_t* yc,
                                        int32_t* cvr) {
-    if (DoubleScanZone == nullptr || xc == nullptr || yc == nullptr || cvr == nullptr) {
+    if (DoubleScanZone == nullptr || xc == nullptr || yc == nullptr || cvr == nullptr)
         return -1;
-    }
     const int32_t width = 8;
     const int32_t height = 8;
     const int32_t size = width * height;

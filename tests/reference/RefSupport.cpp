@@ -11,7 +11,8 @@ namespace reference {
 
 namespace {
 
-void LeaveResults(const uint8_t*, int32_t, int32_t, int32_t*, int32_t) {}
+void LeaveResults(const uint8_t* /*image*/, int32_t /*width*/, int32_t /*height*/,
+                  int32_t* /*results*/, int32_t /*mode*/) {}
 
 }  // namespace
 
@@ -34,9 +35,8 @@ void* Allocate(int64_t bytes) {
     const int64_t number = s_allocationCount++;
     const bool failsOnce = s_failAllocation >= 0 && number == s_failAllocation;
     const bool failsForGood = s_failAllocationsFrom >= 0 && number >= s_failAllocationsFrom;
-    if (failsOnce || failsForGood || bytes < 1) {
+    if (failsOnce || failsForGood || bytes < 1)
         return nullptr;
-    }
     return std::malloc(static_cast<size_t>(bytes));
 }
 
@@ -56,9 +56,8 @@ std::string FormatValues(const char* format, const std::vector<int32_t>& values)
 }
 
 void LogLine(const char* function, int32_t line, const std::string& message) {
-    if (s_logSink == nullptr) {
+    if (s_logSink == nullptr)
         return;
-    }
     char prefix[128];
     std::snprintf(prefix, sizeof prefix, "%-15s:%04d:pid=%d:ctid=%d => ", function, line, 0, 0);
     s_logSink->push_back("4 TQCODE " + std::string(prefix) + message);

@@ -34,9 +34,8 @@ int32_t PassedPixel(const Picture& picture, int32_t x, int32_t y) {
         for (int32_t dx = -kMargin; dx <= kMargin; ++dx) {
             const int32_t grey = picture.At(x + dx, y + dy);
             sum += grey;
-            if (dx >= -1 && dx <= 1 && dy >= -1 && dy <= 1) {
+            if (dx >= -1 && dx <= 1 && dy >= -1 && dy <= 1)
                 blur += weights[dx + 1] * weights[dy + 1] * grey;
-            }
         }
     }
     return blur - sum * 12946 / 65536;
@@ -44,9 +43,8 @@ int32_t PassedPixel(const Picture& picture, int32_t x, int32_t y) {
 
 int64_t Root(int64_t value) {
     int64_t root = 0;
-    while ((root + 1) * (root + 1) <= value) {
+    while ((root + 1) * (root + 1) <= value)
         ++root;
-    }
     return root;
 }
 
@@ -76,9 +74,8 @@ void MeasureArea(const Picture& picture, const Area& area, int32_t* response, in
 void TextureTest(const uint8_t* image, int32_t width, int32_t height, int32_t* results,
                  int32_t /*mode*/) {
     if (image == nullptr || results == nullptr || width < 16 || height < 16 || width > 32768 ||
-        height > 32768) {
+        height > 32768)
         return;
-    }
     const Picture picture = {image, width, height};
     const int32_t columns[5] = {0, width / 4, width / 2, width * 3 / 4, width};
     const int32_t rows[5] = {0, height / 4, height / 2, height * 3 / 4, height};
@@ -87,9 +84,8 @@ void TextureTest(const uint8_t* image, int32_t width, int32_t height, int32_t* r
                            {columns[2], rows[0], columns[4], rows[2]},
                            {columns[0], rows[2], columns[2], rows[4]},
                            {columns[2], rows[2], columns[4], rows[4]}};
-    for (int32_t block = 0; block < 5; ++block) {
+    for (int32_t block = 0; block < 5; ++block)
         MeasureArea(picture, areas[block], &results[block], &results[5 + block]);
-    }
 }
 
 }  // namespace reference

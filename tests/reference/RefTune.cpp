@@ -90,9 +90,8 @@ void EncodeRegister(uint32_t* iTuneDAC) {
 }
 
 int32_t Classify(uint32_t value, const _NAVI_struRange& range) {
-    if (value < range.RANGE_LOW) {
+    if (value < range.RANGE_LOW)
         return -1;
-    }
     return value > range.RANGE_HIGH ? 1 : 0;
 }
 
@@ -116,9 +115,8 @@ void ClassifyMeasurement() {
 // Sides are products: with two negative factors one is positive and no buffer has it.
 bool HasNegativeOrNoBlocks() {
     for (const int32_t factor : {s_blockWidth, s_blockHeight, s_blockColNum, s_blockRowNum}) {
-        if (factor < 1) {
+        if (factor < 1)
             return true;
-        }
     }
     return false;
 }
@@ -173,11 +171,10 @@ void _NAVI_Tune_Operation() {
         _NAVI_Change0C();
         return;
     }
-    if (current == previous + 1 || previous == current + 1) {
+    if (current == previous + 1 || previous == current + 1)
         _NAVI_dc_current = _NAVI_dc_pre;
-    } else {
+    else
         _NAVI_dc_current = WrapAddU32(_NAVI_dc_pre, _NAVI_dc_current) >> 1;
-    }
 }
 
 void _NAVI_Tune_Process() {
@@ -205,20 +202,18 @@ void _NAVI_Tune_Finalize(uint32_t* iTuneDAC) {
         _NAVI_flag_recommend_pre = _NAVI_flag_recommend;
     }
     // The value that was in the sensor for this frame, before the register is rewritten.
-    if (_NAVI_dc_mode == 1) {
+    if (_NAVI_dc_mode == 1)
         _NAVI_dc_pre = LowByte(*iTuneDAC);
-    } else if (_NAVI_dc_mode == 0) {
+    else if (_NAVI_dc_mode == 0)
         _NAVI_dc_pre = ByteDifference(*iTuneDAC);
-    }
     EncodeRegister(iTuneDAC);
 }
 
 namespace {
 
 bool IsTuningComplete() {
-    if (_NAVI_NoMoreProcess <= 1 && _NAVI_TimeOut > 0) {
+    if (_NAVI_NoMoreProcess <= 1 && _NAVI_TimeOut > 0)
         return true;
-    }
     return _NAVI_TimeOut_threshold > 0 && _NAVI_TimeOut >= _NAVI_TimeOut_threshold;
 }
 
@@ -227,17 +222,14 @@ bool IsTuningComplete() {
 // img_width and img_height are accepted and not used: the geometry is the parameter block's.
 int32_t _NAVI_Tune(const uint8_t* img, int32_t /*img_width*/, int32_t /*img_height*/,
                    uint32_t* iTuneDAC, const uint32_t* iGain20, const uint32_t* iGain2C) {
-    if (img == nullptr || iTuneDAC == nullptr || iGain20 == nullptr || iGain2C == nullptr) {
+    if (img == nullptr || iTuneDAC == nullptr || iGain20 == nullptr || iGain2C == nullptr)
         return -1;
-    }
-    if (s_modeFlag == 1) {
+    if (s_modeFlag == 1)
         return 1;
-    }
     _NAVI_TimeOut = WrapAdd32(_NAVI_TimeOut, 1);
     sImgSizeInfo = {s_imageHeight, s_imageWidth};
-    if (_NAVI_Tune_Init(img, iTuneDAC, iGain20, iGain2C) == 0) {
+    if (_NAVI_Tune_Init(img, iTuneDAC, iGain20, iGain2C) == 0)
         return 0;
-    }
     _NAVI_Tune_Process();
     _NAVI_Tune_Finalize(iTuneDAC);
     if (IsTuningComplete()) {

@@ -33,18 +33,16 @@ void CutCorners(int32_t height, int32_t width, _NAVI_BlkNode (&Blk_Nodes)[kCorne
 int32_t SumBlock(const uint8_t* img, int32_t width, const _NAVI_BlkNode& node) {
     int32_t sum = 0;
     for (int32_t row = node.StartHeight; row < node.EndHeight; ++row) {
-        for (int32_t column = node.StartWidth; column < node.EndWidth; ++column) {
+        for (int32_t column = node.StartWidth; column < node.EndWidth; ++column)
             sum = WrapAdd32(sum, img[int64_t{row} * width + column]);
-        }
     }
     return sum;
 }
 
 void CountBlock(const uint8_t* img, int32_t width, const _NAVI_BlkNode& node) {
     for (int32_t row = node.StartHeight; row < node.EndHeight; ++row) {
-        for (int32_t column = node.StartWidth; column < node.EndWidth; ++column) {
+        for (int32_t column = node.StartWidth; column < node.EndWidth; ++column)
             ++_NAVI_img_histogram[img[int64_t{row} * width + column]];
-        }
     }
 }
 
@@ -67,18 +65,16 @@ int32_t _NAVI_ImgHistogram(const uint8_t* img, int32_t height, int32_t width) {
         LogLine("_NAVI_ImgHistogram", 1590, "error! size cannot be divided by 16!\n");
         return -1;
     }
-    if (!IsMeasurable(height, width)) {
+    if (!IsMeasurable(height, width))
         return -1;
-    }
     int32_t blk_mean[kCornerNum] = {0, 0, 0, 0};
     int32_t blk_origin_order[kCornerNum] = {0, 1, 2, 3};
     _NAVI_BlkNode Blk_Nodes[kCornerNum] = {};
     const int32_t blk_length = BlockLength(height, width);
     std::memset(_NAVI_img_histogram, 0, sizeof _NAVI_img_histogram);
     CutCorners(height, width, Blk_Nodes);
-    for (int32_t b = 0; b < kCornerNum; ++b) {
+    for (int32_t b = 0; b < kCornerNum; ++b)
         blk_mean[b] = SumBlock(img, width, Blk_Nodes[b]) / blk_length;
-    }
     _NAVI_SortIndex(blk_mean, blk_origin_order, kCornerNum);
     _NAVI_mean = static_cast<uint32_t>(blk_mean[_NAVI_blk_selection_mode]);
     CountBlock(img, width, Blk_Nodes[blk_origin_order[_NAVI_blk_selection_mode]]);
@@ -114,12 +110,10 @@ int32_t SumBrightest(const uint32_t* histogram, int32_t threshold) {
     int32_t sum = 0;
     for (int32_t index = 255; index >= 0; --index) {
         const int32_t h = static_cast<int32_t>(histogram[index]);
-        if (h == 0) {
+        if (h == 0)
             continue;
-        }
-        if (WrapAdd32(num_from_end, h) >= threshold) {
+        if (WrapAdd32(num_from_end, h) >= threshold)
             return WrapAdd32(sum, WrapMul32(index, WrapSub32(threshold, num_from_end)));
-        }
         sum = WrapAdd32(sum, WrapMul32(index, h));
         num_from_end = WrapAdd32(num_from_end, h);
     }
@@ -130,14 +124,12 @@ int32_t SumBrightest(const uint32_t* histogram, int32_t threshold) {
 
 int32_t _NAVI_CalcTop(uint32_t X, uint32_t Y, const uint32_t* histogram) {
     uint32_t img_count = 0;
-    for (int32_t index = 0; index < 256; ++index) {
+    for (int32_t index = 0; index < 256; ++index)
         img_count = WrapAddU32(img_count, histogram[index]);
-    }
     const int32_t i_threshold_X = static_cast<int32_t>(WrapMulU32(img_count, X) / 100U);
     const int32_t i_threshold_Y = static_cast<int32_t>(WrapMulU32(img_count, Y) / 100U);
-    if (i_threshold_X == i_threshold_Y) {
+    if (i_threshold_X == i_threshold_Y)
         return -1;
-    }
     const int32_t i_top_X = SumBrightest(histogram, i_threshold_X);
     const int32_t i_top_Y = SumBrightest(histogram, i_threshold_Y);
     return WrapDiv32(WrapSub32(i_top_Y, i_top_X), WrapSub32(i_threshold_Y, i_threshold_X));
@@ -170,9 +162,8 @@ bool AreGainsUsable(uint32_t g) {
 
 // 0 for codes outside the tables. The reference product is at most 140 * 8 * 8.
 int32_t _NAVI_K_CALC(uint32_t g) {
-    if (!AreGainsUsable(g)) {
+    if (!AreGainsUsable(g))
         return 0;
-    }
     const GainFields actual = UnpackGain(g);
     const GainFields ref = UnpackGain(static_cast<uint32_t>(_NAVI_GAIN_REF));
     int32_t input_k_g_r = WrapMul32(_NAVI_INPUT_K, _NAVI_gain_ratio_21[actual.ratio21]);

@@ -17,17 +17,15 @@ constexpr uint32_t kDcMax = 255;
 // The step that moves `grey` to the target, at least 1; without a gain factor exactly 1. A grey
 // level on the target leaves the step as it was.
 void UpdateStep(int32_t grey, uint32_t* step) {
-    if (grey == kMiddle) {
+    if (grey == kMiddle)
         return;
-    }
     const uint32_t target = static_cast<uint32_t>(kMiddle);
     const uint32_t level = static_cast<uint32_t>(grey);
     const uint32_t distance =
         grey < kMiddle ? WrapSubU32(target, level) : WrapSubU32(level, target);
     uint32_t size = 1;
-    if (_NAVI_K_value != 0) {
+    if (_NAVI_K_value != 0)
         size = WrapMulU32(_NAVI_ENLARGE_K, distance) / _NAVI_K_value;
-    }
     *step = size == 0 ? 1 : size;
 }
 
@@ -63,9 +61,8 @@ void _NAVI_GetDelta() {
         _NAVI_delta_dc_orient = 1;
         _NAVI_delta_dc_val = _NAVI_delta_dc_val_mean;
     }
-    if (_NAVI_flag_non_linear != 0 && _NAVI_delta_dc_val < kSaturatedStep) {
+    if (_NAVI_flag_non_linear != 0 && _NAVI_delta_dc_val < kSaturatedStep)
         _NAVI_delta_dc_val = kSaturatedStep;
-    }
 }
 
 namespace {
@@ -87,24 +84,22 @@ void LowerDc() {
         return;
     }
     const int32_t leastForStep = static_cast<int32_t>(WrapAddU32(lowest, _NAVI_delta_dc_val));
-    if (static_cast<int32_t>(_NAVI_dc_current) > leastForStep) {
+    if (static_cast<int32_t>(_NAVI_dc_current) > leastForStep)
         _NAVI_dc_current = WrapSubU32(_NAVI_dc_current, _NAVI_delta_dc_val);
-    } else {
+    else
         _NAVI_dc_current = lowest;
-    }
     _NAVI_NoMoreProcess = AfterStep();
 }
 
 }  // namespace
 
 void _NAVI_Change0C() {
-    if (_NAVI_delta_dc_orient == 1) {
+    if (_NAVI_delta_dc_orient == 1)
         RaiseDc();
-    } else if (_NAVI_delta_dc_orient == -1) {
+    else if (_NAVI_delta_dc_orient == -1)
         LowerDc();
-    } else {
+    else
         _NAVI_NoMoreProcess = 0;
-    }
 }
 
 }  // namespace reference

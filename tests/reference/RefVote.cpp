@@ -41,9 +41,8 @@ VerdictCounts CountVerdicts(int32_t calc_cnt) {
 }
 
 bool CountRuleAccepts(const VerdictCounts& counts) {
-    if (counts.move_cnt >= s_moveCntEffThr) {
+    if (counts.move_cnt >= s_moveCntEffThr)
         return true;
-    }
     return counts.no_move_cnt < counts.move_cnt && counts.move_cnt > s_moveCntMinThr;
 }
 
@@ -55,18 +54,14 @@ bool Prevails(const VerdictCounts& counts, const Axis& axis, int32_t key, int32_
 
 int32_t DecideAxis(const VerdictCounts& counts, const Axis& axis, int32_t init, int32_t final,
                    int32_t total) {
-    if (WrapAbs32(total) < s_totalMoveThreshold) {
+    if (WrapAbs32(total) < s_totalMoveThreshold)
         return VKEY_NO_MOVE;
-    }
-    if (WrapMul32(init, final) < 0) {
+    if (WrapMul32(init, final) < 0)
         return total > 0 ? axis.positiveKey : axis.negativeKey;
-    }
-    if (Prevails(counts, axis, axis.positiveKey, axis.negativeKey)) {
+    if (Prevails(counts, axis, axis.positiveKey, axis.negativeKey))
         return CountRuleAccepts(counts) ? axis.positiveKey : VKEY_NO_MOVE;
-    }
-    if (Prevails(counts, axis, axis.negativeKey, axis.positiveKey)) {
+    if (Prevails(counts, axis, axis.negativeKey, axis.positiveKey))
         return CountRuleAccepts(counts) ? axis.negativeKey : VKEY_NO_MOVE;
-    }
     return VKEY_NO_MOVE;
 }
 
@@ -83,29 +78,24 @@ int32_t Voting_hg_mode() {
     s_voteInfo.dx_sum = total_dx;
     s_voteInfo.dy_sum = total_dy;
     const VerdictCounts counts = CountVerdicts(calc_cnt);
-    if (counts.move_cnt == 0) {
+    if (counts.move_cnt == 0)
         return VKEY_NO_MOVE;
-    }
     const int32_t ax = WrapAbs32(total_dx);
     const int32_t ay = WrapAbs32(total_dy);
-    if (WrapMul32(100, Max32(ax, ay)) < WrapMul32(120, Min32(ax, ay))) {
+    if (WrapMul32(100, Max32(ax, ay)) < WrapMul32(120, Min32(ax, ay)))
         return VKEY_NO_MOVE;
-    }
-    if (ax > ay) {
+    if (ax > ay)
         return DecideAxis(counts, kHorizontal, x_init, x_final, total_dx);
-    }
     return DecideAxis(counts, kVertical, y_init, y_final, total_dy);
 }
 
 namespace {
 
 int32_t ApplyMounting(int32_t vkey_value) {
-    if (s_sensorBackFlag != 1) {
+    if (s_sensorBackFlag != 1)
         return vkey_value;
-    }
-    if (vkey_value == VKEY_RIGHT) {
+    if (vkey_value == VKEY_RIGHT)
         return VKEY_LEFT;
-    }
     return vkey_value == VKEY_LEFT ? VKEY_RIGHT : vkey_value;
 }
 
@@ -113,25 +103,22 @@ int32_t ApplyDirectionControl(int32_t vkey_value) {
     const bool horizontal = vkey_value == VKEY_RIGHT || vkey_value == VKEY_LEFT;
     const bool vertical = vkey_value == VKEY_UP || vkey_value == VKEY_DOWN;
     if (s_directionControlFlag == 0 || (s_directionControlFlag == 1 && horizontal) ||
-        (s_directionControlFlag == 2 && vertical)) {
+        (s_directionControlFlag == 2 && vertical))
         return VKEY_NO_MOVE;
-    }
     return vkey_value;
 }
 
 }  // namespace
 
 int32_t Voting(int32_t time_out) {
-    if (time_out != 1 && s_lastFrameFlag != 1) {
+    if (time_out != 1 && s_lastFrameFlag != 1)
         return -1;
-    }
     int32_t vkey_value = s_modeFlag == 1 ? Voting_hg_mode() : Voting_fp_mode();
     vkey_value = ApplyDirectionControl(ApplyMounting(vkey_value));
-    if (s_logShowFlag == 1) {
+    if (s_logShowFlag == 1)
         LogLine("Voting", 498,
                 FormatValues("TQCODE -- TARQEN_FP_NAVI -- Voting - FINAL VKEY VALUE = %d!!\n",
                              {vkey_value}));
-    }
     return vkey_value;
 }
 

@@ -89,9 +89,8 @@ int32_t AddShares(int32_t dx, int32_t dy, int32_t (&method)[kDirectionNum]) {
     const int32_t dx_tmp = WrapMul32(sqrt_precision_times, WrapAbs32(dx));
     const int32_t dy_tmp = WrapMul32(sqrt_precision_times, WrapAbs32(dy));
     const int32_t sum_tmp = WrapAdd32(dx_tmp, dy_tmp);
-    if (sum_tmp == 0) {
+    if (sum_tmp == 0)
         return -1;
-    }
     int32_t& vertical = method[dy > 0 ? kUp : kDown];
     int32_t& horizontal = method[dx > 0 ? kRight : kLeft];
     vertical = WrapAdd32(vertical, WrapDiv32(WrapMul32(precision_times, dy_tmp), sum_tmp));
@@ -119,26 +118,22 @@ int32_t AddPair(int32_t i, GestureSums* sums) {
     const int32_t length_judge_ct = ScaledLength(cx, cy);
     const int32_t length_judge_fp = ScaledLength(fx, fy);
     const int32_t leastLength = WrapMul32(precision_times, s_minDelta);
-    if (length_judge_ct >= leastLength && AddShares(cx, cy, sums->method_ct) == -1) {
+    if (length_judge_ct >= leastLength && AddShares(cx, cy, sums->method_ct) == -1)
         return -1;
-    }
     if (fpTrusted && length_judge_fp >= leastLength) {
-        if (length_judge_fp == 0 || AddShares(fx, fy, sums->method_fp) == -1) {
+        if (length_judge_fp == 0 || AddShares(fx, fy, sums->method_fp) == -1)
             return -1;
-        }
     }
     return 0;
 }
 
 // Whether the gesture moved far enough, in enough pairs, for a key.
 bool HasMoved(const GestureSums& sums, int32_t ct_final_distance, int32_t fp_final_distance) {
-    if (PairsOf(s_voteInfo) == 0) {
+    if (PairsOf(s_voteInfo) == 0)
         return false;
-    }
     const int32_t final_ct_and_fp = WrapAdd32(ct_final_distance, fp_final_distance);
-    if (final_ct_and_fp <= s_totalMoveThreshold) {
+    if (final_ct_and_fp <= s_totalMoveThreshold)
         return false;
-    }
     const int32_t movingPairs = PairsOf(s_voteInfo) - sums.count_of_diff_result;
     return movingPairs > 1 || s_directionControlFlag != 1;
 }
@@ -155,19 +150,15 @@ int32_t ChooseKey(const GestureSums& sums) {
         Max32(Max32(score[kUp], score[kRight]), Max32(score[kDown], score[kLeft]));
     const bool allEqual = score[kUp] == score[kRight] && score[kRight] == score[kDown] &&
                           score[kDown] == score[kLeft];
-    if (allEqual && s_open_vkey_none_navi == 1) {
+    if (allEqual && s_open_vkey_none_navi == 1)
         return VKEY_NONE;
-    }
     int32_t vkey_value = VKEY_UP;
-    if (score[kDown] == score_max) {
+    if (score[kDown] == score_max)
         vkey_value = VKEY_DOWN;
-    }
-    if (score[kRight] == score_max) {
+    if (score[kRight] == score_max)
         vkey_value = VKEY_RIGHT;
-    }
-    if (score[kLeft] == score_max) {
+    if (score[kLeft] == score_max)
         vkey_value = VKEY_LEFT;
-    }
     return vkey_value;
 }
 
@@ -180,30 +171,25 @@ bool IsLongPress(int32_t ct_final_distance, int32_t fp_final_distance) {
 }  // namespace
 
 int32_t Voting_fp_mode() {
-    if (s_logShowFlag == 1) {
+    if (s_logShowFlag == 1)
         LogVoteInformation();
-    }
     GestureSums sums = {};
     const int32_t pairs = PairsOf(s_voteInfo);
     for (int32_t i = 0; i < pairs; ++i) {
-        if (AddPair(i, &sums) == -1) {
+        if (AddPair(i, &sums) == -1)
             return -1;
-        }
     }
     const int32_t ct_final_distance = IntSqrt(SquaredLength(sums.dx_sum_ct, sums.dy_sum_ct));
     const int32_t fp_final_distance = IntSqrt(SquaredLength(sums.dx_sum_fp, sums.dy_sum_fp));
     const bool hardlyMoved =
         ct_final_distance < s_ct_none_threshold && ct_final_distance > 0 && fp_final_distance == 0;
-    if (hardlyMoved && sums.count_of_diff_result == 0 && s_open_vkey_none_navi == 1) {
+    if (hardlyMoved && sums.count_of_diff_result == 0 && s_open_vkey_none_navi == 1)
         return VKEY_NONE;
-    }
     if (sums.count_of_diff_result != 0 && fp_final_distance <= s_fpMoveThreshold &&
-        ct_final_distance <= s_ct_not_move_threshold) {
+        ct_final_distance <= s_ct_not_move_threshold)
         return VKEY_NO_MOVE;
-    }
-    if (!HasMoved(sums, ct_final_distance, fp_final_distance)) {
+    if (!HasMoved(sums, ct_final_distance, fp_final_distance))
         return VKEY_NO_MOVE;
-    }
     const int32_t vkey_value = ChooseKey(sums);
     return IsLongPress(ct_final_distance, fp_final_distance) ? VKEY_NO_MOVE : vkey_value;
 }

@@ -334,7 +334,6 @@ int32_t CalcImgJoint();
 
 int32_t Voting_hg_mode();
 int32_t Voting_fp_mode();
-int32_t IntSqrt(int32_t x);
 
 // ---- Finger presence ---------------------------------------------------------------------------
 

@@ -14,6 +14,7 @@
 #include "gesture/NaviVoteInfo.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi_test {
@@ -66,7 +67,7 @@ class Frames {
 void NotePair(Reached* reached) {
     using namespace fpnavi;
     reached->centroid = true;
-    if (s_modeFlag == 1)
+    if (IsHg())
         return;
     const int32_t verdict = FingerNoMove(&s_imagePrev, &s_imageCurr);
     reached->noMove = reached->noMove || verdict != kNoMoveUndetermined;
@@ -101,7 +102,8 @@ Reached RunTwin(const ParamBlock& params, Mode mode, uint64_t seed) {
     return reached;
 }
 
-int Silence(void*, int, const char*, const char*, std::va_list) {
+int Silence(void* /*context*/, int /*level*/, const char* /*tag*/, const char* /*format*/,
+            std::va_list /*args*/) {
     return 0;
 }
 
@@ -147,7 +149,7 @@ bool RunsAlone(const ParamBlock& params, Mode mode, uint64_t seed, int64_t* mill
 bool RunHostile(const ParamBlock& params, Mode mode, uint64_t seed, Reached* reached) {
     Twin& twin = Twin::Get();
     twin.SetParam(&params);
-    if (CheapEnough(params) && twin.ImageFits()) {
+    if (CheapEnough(params) && Twin::ImageFits()) {
         *reached = RunTwin(params, mode, seed);
         EXPECT_EQ(twin.Difference().value_or("none"), "none");
         return !twin.Difference().has_value();

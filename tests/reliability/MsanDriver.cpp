@@ -13,6 +13,7 @@
 #include "MsanGestures.h"
 #include "ParamTable.h"
 #include "alog_host.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace {
@@ -40,7 +41,8 @@ void See(int64_t value) {
     s_seen += value > 0 ? value : 1;
 }
 
-int SeeLine(void*, int, const char*, const char* format, std::va_list args) {
+int SeeLine(void* /*context*/, int /*level*/, const char* /*tag*/, const char* format,
+            std::va_list args) {
     char text[2048];
     const int length = std::vsnprintf(text, sizeof text, format, args);
     for (int i = 0; i < length && i < static_cast<int>(sizeof text) - 1; ++i)
@@ -85,7 +87,7 @@ bool ImageFits() {
     const bool sane = s_blockWidth > 0 && s_blockHeight > 0 && s_blockColNum > 0 &&
                       s_blockRowNum > 0 && s_blockWidth <= 256 && s_blockHeight <= 256 &&
                       s_blockColNum <= 256 && s_blockRowNum <= 256;
-    const bool hgFits = s_modeFlag != 1 || s_imageWidthHg <= 0 || s_imageHeightHg <= 0 ||
+    const bool hgFits = !IsHg() || s_imageWidthHg <= 0 || s_imageHeightHg <= 0 ||
                         int64_t{s_imageWidthHg} * s_imageHeightHg <= kRoom;
     return sane && hgFits && int64_t{s_imageWidth} * s_imageHeight <= kRoom;
 }

@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <optional>
 
-#include "Reference.h"
+#include "RefMath.h"
 #include "base/NaviMath.h"
 
 namespace fpnavi_test {

@@ -112,7 +112,7 @@ size_t ParamIndex(std::string_view name) {
     std::abort();
 }
 
-Params::Params() : m_values{} {
+Params::Params() {
     for (size_t i = 0; i < m_values.size(); ++i)
         m_values[i] = kTable[i].defaultValue;
 }
@@ -140,6 +140,7 @@ std::vector<int32_t> DerivedState() {
 
 std::vector<int32_t> StoredState() {
     std::vector<int32_t> state;
+    state.reserve(kTable.size());
     for (const ParamEntry& entry : kTable)
         state.push_back(entry.Stored());
     return state;

@@ -35,7 +35,7 @@ class Params {
     const std::array<int32_t, FPNAVI_PARAM_NUM>& Values() const { return m_values; }
 
   private:
-    std::array<int32_t, FPNAVI_PARAM_NUM> m_values;
+    std::array<int32_t, FPNAVI_PARAM_NUM> m_values{};
 };
 
 // The module's derived variables, and its parameter variables in block order.

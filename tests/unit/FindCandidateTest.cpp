@@ -78,12 +78,12 @@ using Displacements = std::vector<std::pair<int32_t, int32_t>>;  // rows, column
 
 class Candidates : public NaviTest {
   protected:
-    void Load(TestFrame& prev, TestFrame& curr) {
+    static void Load(TestFrame& prev, TestFrame& curr) {
         ASSERT_EQ(ImgCopy(&s_imagePrev, prev.Get()), 0);
         ASSERT_EQ(ImgCopy(&s_imageCurr, curr.Get()), 0);
     }
     // All candidates, sorted: their order in the heap does not matter to a reader.
-    Displacements Find(TestFrame& prev, TestFrame& curr, int32_t expected = 0) {
+    static Displacements Find(TestFrame& prev, TestFrame& curr, int32_t expected = 0) {
         Load(prev, curr);
         const auto number = static_cast<size_t>(s_candidateNum);
         std::vector<int32_t> di(number);

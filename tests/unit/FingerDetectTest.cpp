@@ -33,9 +33,8 @@ struct Frame {
     }
     void Fill(int32_t left, int32_t top, int32_t right, int32_t bottom, int32_t value) {
         for (int32_t y = top; y < bottom; y++) {
-            for (int32_t x = left; x < right; x++) {
+            for (int32_t x = left; x < right; x++)
                 Set(x, y, value);
-            }
         }
     }
     Results Measure() const {
@@ -72,9 +71,8 @@ int32_t Ridge(int32_t x, int32_t y, int32_t period, Direction across, int32_t am
 Frame Ridges(int32_t period, Direction across, int32_t amplitude, int32_t ground = 128) {
     Frame frame(0);
     for (int32_t y = 0; y < kHeight; y++) {
-        for (int32_t x = 0; x < kWidth; x++) {
+        for (int32_t x = 0; x < kWidth; x++)
             frame.Set(x, y, ground + Ridge(x, y, period, across, amplitude));
-        }
     }
     return frame;
 }
@@ -90,9 +88,8 @@ int32_t Strongest(const Results& r) {
 // variance n * n - 1.
 int32_t Noise(std::mt19937& random, int32_t tenths) {
     int32_t sum = 0;
-    for (int32_t i = 0; i < 12; i++) {
+    for (int32_t i = 0; i < 12; i++)
         sum += static_cast<int32_t>(random() % static_cast<uint32_t>(tenths));
-    }
     return (sum - 6 * (tenths - 1)) / 10;
 }
 
@@ -130,32 +127,28 @@ TEST(FingerBlkTest, FlatFrameHasNoTextureAndItsOwnMean) {
 TEST(FingerBlkTest, LinearGradientIsNoTexture) {
     Frame frame(0);
     for (int32_t y = 0; y < kHeight; y++) {
-        for (int32_t x = 0; x < kWidth; x++) {
+        for (int32_t x = 0; x < kWidth; x++)
             frame.Set(x, y, 10 + 2 * x + 3 * y);
-        }
     }
     EXPECT_EQ(Strongest(frame.Measure()), 0);
 }
 
 TEST(FingerBlkTest, RidgesOfSkinPassInEveryDirection) {
     for (int32_t period = 5; period <= 11; period++) {
-        for (const Direction across : kDirections) {
+        for (const Direction across : kDirections)
             EXPECT_GE(Weakest(Ridges(period, across, 30).Measure()), 2 * kThreshold)
                 << "period " << period << " across " << across.x << ", " << across.y;
-        }
     }
 }
 
 TEST(FingerBlkTest, OtherPeriodsRespondLess) {
     for (const Direction across : kDirections) {
         int32_t weakestInBand = 1 << 30;
-        for (int32_t period = 5; period <= 11; period++) {
+        for (int32_t period = 5; period <= 11; period++)
             weakestInBand = std::min(weakestInBand, Weakest(Ridges(period, across, 100).Measure()));
-        }
-        for (const int32_t period : {2, 24, 40}) {
+        for (const int32_t period : {2, 24, 40})
             EXPECT_LT(2 * Strongest(Ridges(period, across, 100).Measure()), weakestInBand)
                 << "period " << period << " across " << across.x << ", " << across.y;
-        }
     }
 }
 
@@ -166,14 +159,12 @@ TEST(FingerBlkTest, ResponseIsTwiceTheRootMeanSquareOfTheRidges) {
     for (const int32_t amplitude : {40, 80, 120}) {
         Frame frame(0, 252, 36);
         for (int32_t y = 0; y < frame.height; y++) {
-            for (int32_t x = 0; x < frame.width; x++) {
+            for (int32_t x = 0; x < frame.width; x++)
                 frame.Set(x, y, 128 + Ridge(x, y, 9, {1000, 0}, amplitude));
-            }
         }
         const Results results = frame.Measure();
-        for (size_t block = 0; block < 5; block++) {
+        for (size_t block = 0; block < 5; block++)
             EXPECT_NEAR(results[block], 1.249 * amplitude, 1 + 0.03 * amplitude);
-        }
     }
 }
 
@@ -207,12 +198,11 @@ TEST(FingerBlkTest, NoiseAndFixedPatternStayBelow) {
         const int32_t ground = 200 + static_cast<int32_t>(random() % 56);  // also cut at 255
         Frame frame(0);
         for (int32_t y = 0; y < kHeight; y++) {
-            for (int32_t x = 0; x < kWidth; x++) {
+            for (int32_t x = 0; x < kWidth; x++)
                 frame.Set(x, y,
                           ground - x / 4 + column[static_cast<size_t>(x)] +
                               row[static_cast<size_t>(y)] +
                               block[static_cast<size_t>(y / 2 * 7 + x / 8)] + Noise(random, 36));
-            }
         }
         EXPECT_LT(Strongest(frame.Measure()), kThreshold);
     }
@@ -239,9 +229,8 @@ TEST(FingerBlkTest, TextureNearACornerRaisesThatQuarterAlone) {
     for (const Corner corner : {Corner{0, 0, 1}, {46, 0, 2}, {0, 22, 3}, {46, 22, 4}}) {
         Frame frame(200);
         for (int32_t y = corner.y; y < corner.y + 14; y++) {
-            for (int32_t x = corner.x; x < corner.x + 10; x++) {
+            for (int32_t x = corner.x; x < corner.x + 10; x++)
                 frame.Set(x, y, 200 + Ridge(x, y, 8, {707, 707}, 55));
-            }
         }
         const Results results = frame.Measure();
         for (size_t block = 0; block < 5; block++) {
@@ -258,9 +247,8 @@ TEST(FingerBlkTest, TextureNearACornerRaisesThatQuarterAlone) {
 TEST(FingerBlkTest, TextureInTheMiddleRaisesAllAndTheCentreMost) {
     Frame frame(200);
     for (int32_t y = 10; y < 26; y++) {
-        for (int32_t x = 18; x < 38; x++) {
+        for (int32_t x = 18; x < 38; x++)
             frame.Set(x, y, 200 + Ridge(x, y, 8, {707, 707}, 55));
-        }
     }
     const Results results = frame.Measure();
     EXPECT_GE(Weakest(results), kThreshold);
@@ -281,9 +269,8 @@ TEST(FingerBlkTest, MeansTellWhereTheBlocksLie) {
         Frame frame(200);
         frame.Fill(place.left, place.top, place.left + 28, place.top + 18, 40);
         const Results results = frame.Measure();
-        for (size_t block = 0; block < 5; block++) {
+        for (size_t block = 0; block < 5; block++)
             EXPECT_EQ(results[5 + block], place.means[block]) << "block " << block;
-        }
     }
 }
 
@@ -308,13 +295,16 @@ TEST(FingerBlkTest, EqualsThePlainDefinitionAtAnySize) {
         const int32_t amplitude = static_cast<int32_t>(random() % 128);
         const Direction across = kDirections[random() % kDirections.size()];
         for (int32_t y = 0; y < h; y++) {
-            for (int32_t x = 0; x < w; x++) {
+            for (int32_t x = 0; x < w; x++)
                 frame.Set(x, y, 128 + Ridge(x, y, 7, across, amplitude) + Noise(random, 50));
-            }
         }
         const Results results = frame.Measure();
-        const int32_t x1 = w / 4, x2 = w / 2, x3 = w * 3 / 4;
-        const int32_t y1 = h / 4, y2 = h / 2, y3 = h * 3 / 4;
+        const int32_t x1 = w / 4;
+        const int32_t x2 = w / 2;
+        const int32_t x3 = w * 3 / 4;
+        const int32_t y1 = h / 4;
+        const int32_t y2 = h / 2;
+        const int32_t y3 = h * 3 / 4;
         const std::array<double, 5> plain = {
             PlainResponse(frame, x1, y1, x3, y3), PlainResponse(frame, 0, 0, x2, y2),
             PlainResponse(frame, x2, 0, w, y2), PlainResponse(frame, 0, y2, x2, h),
@@ -330,9 +320,8 @@ TEST(FingerBlkTest, EqualsThePlainDefinitionAtAnySize) {
 TEST(FingerBlkTest, LargestContrastDoesNotOverflow) {
     Frame frame(0, 4096, 4096);
     for (int32_t y = 0; y < frame.height; y++) {
-        for (int32_t x = 0; x < frame.width; x++) {
+        for (int32_t x = 0; x < frame.width; x++)
             frame.At(x, y) = (x / 4 + y / 4) % 2 == 0 ? 255 : 0;
-        }
     }
     const Results results = frame.Measure();
     for (size_t block = 0; block < 5; block++) {

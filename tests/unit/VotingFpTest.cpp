@@ -277,12 +277,14 @@ class FpVoteLog : public FpVote {
     // Entries of an array that starts at base, 0 to 10.
     static std::vector<int32_t> Eleven(int32_t base) {
         std::vector<int32_t> values;
+        values.reserve(11);
         for (int32_t k = 0; k < 11; ++k)
             values.push_back(base + k);
         return values;
     }
     static std::vector<int32_t> ElevenPairs(int32_t baseX, int32_t baseY) {
         std::vector<int32_t> values;
+        values.reserve(11);
         for (int32_t k = 0; k < 11; ++k) {
             values.push_back(baseX + k);
             values.push_back(baseY + k);

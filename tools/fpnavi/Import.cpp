@@ -60,7 +60,7 @@ int64_t CheckPaths(const Options& options) {
             ids.insert(std::move(id));
     }
     int64_t count = 0;
-    for (const std::string& path : options.paths) {
+    for (const std::string& path : options.paths)
         host::ImportFng(path, [&](host::Gesture&& gesture) {
             if (!ids.insert(gesture.id).second)
                 throw host::Error(
@@ -68,7 +68,6 @@ int64_t CheckPaths(const Options& options) {
                     fmt::format("the id is taken, expected one that is new to {}", options.corpus));
             ++count;
         });
-    }
     return count;
 }
 
@@ -80,13 +79,12 @@ int RunFng(const Options& options) {
         // All or nothing: after a kill or a full disk the same command can be run again.
         host::Store::Batch batch(store);
         Progress progress("imported", count, true);
-        for (const std::string& path : options.paths) {
+        for (const std::string& path : options.paths)
             host::ImportFng(path, [&](host::Gesture&& gesture) {
                 store.Append(gesture);
                 frames += static_cast<int64_t>(gesture.frames.size());
                 progress.Step();
             });
-        }
         batch.Commit();
     }
     Report(options, count, frames, store);

@@ -36,11 +36,12 @@ inline int32_t SumBlock(const uint8_t* frame, int32_t first, int32_t width, int3
             sums = AddBytes(sums, Load16(p));
             p += kLanes;
         }
-        if (p + left - frame >= kLanes)
+        if (p + left - frame >= kLanes) {
             sums = AddBytes(sums, And16(Load16(p + left - kLanes), last));
-        else
+        } else {
             for (; left > 0; --left)
                 nearStart += *p++;
+        }
     }
     return Total(sums) + nearStart;
 }

@@ -12,6 +12,7 @@
 #include "motion/DoubleScan.h"
 #include "motion/FingerNoMove.h"
 #include "param/NaviLimits.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -102,20 +103,20 @@ int32_t OrntCalcProcess() {
     const int32_t n = PairCount(s_voteInfo);
     if (n >= kPairMax)
         return 0;
-    if (s_modeFlag != 1 && !PairWorkAcceptable())
+    if (!IsHg() && !PairWorkAcceptable())
         return -1;
     // The previous frame was measured as the current one of the last pair, but for the first pair.
     if (!IsMeasured(s_imagePrev) && GetCenterAndCoverage(&s_imagePrev) != 0)
         return -1;
     if (GetCenterAndCoverage(&s_imageCurr) != 0)
         return -1;
-    if (s_doubleScanFlag == 1)
+    if (ScansTwice())
         CalcDoubleScanMove(DoubleScanZonePrev, DoubleScanZoneCurr, &s_voteInfo);
     if (CoversLess(s_coverageMinEff))
         return 0;
     CalcCenterMove(&s_imagePrev, &s_imageCurr, &s_voteInfo);
     RecordCenters(n);
-    if (s_modeFlag == 1) {
+    if (IsHg()) {
         if (s_voteInfo.vkey_ct[n] == VKEY_NO_MOVE)
             RecordRest(n);
     } else if (CompareFingerprints(n) != 0) {
@@ -129,11 +130,11 @@ int32_t OrntCalcProcess() {
 
 int32_t OrientationCalc(const uint8_t* data_prev, const uint8_t* data_curr, int32_t time_out) {
     using namespace fpnavi;
-    if (s_logShowFlag == 1)
+    if (LogShown())
         NAVI_LOG("OrientationCalc", 328, "TQCODE - OrientationCalc - Navi.ver.01.07.10!\n");
     if (data_prev == nullptr || data_curr == nullptr)
         return -1;
-    if (s_lastFrameFlag == 1 || time_out == 1)
+    if (FingerLifted() || time_out == 1)
         return 0;
     s_frameNum = WrapAdd(s_frameNum, 1);
     int32_t result = -1;

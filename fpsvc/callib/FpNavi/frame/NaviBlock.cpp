@@ -2,6 +2,7 @@
 #include <cstring>
 
 #include "param/NaviLimits.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -37,7 +38,7 @@ int32_t GetNaviBlock(const uint8_t* p_data_origin, int32_t width, int32_t /*heig
         const int32_t column = b % s_blockColNum * s_blockWidth;
         PlaceBlock(p_data_origin + b * blkSize, p_data_resort + row * s_imageWidth + column);
     }
-    if (s_directionControlFlag == 1 && s_modeFlag == 2)
+    if (s_directionControlFlag == kDirectionVertical && IsDoubleScan())
         CopySecondRowOverFirst(width, p_data_resort);
     return 0;
 }

@@ -3,6 +3,7 @@
 
 #include "base/NaviMath.h"
 #include "frame/NaviFrame.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -21,7 +22,7 @@ void MarkDarkPixels(NaviFrame_t* img) {
 // The greys are counted once: what the threshold needs is their histogram, what the stretch needs
 // is the same without the pixels outside the finger area.
 int32_t ImgPreProcess(NaviFrame_t* img) {
-    if (s_modeFlag == 1) {
+    if (IsHg()) {
         MarkDarkPixels(img);
         return 0;
     }

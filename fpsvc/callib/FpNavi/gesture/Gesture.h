@@ -10,6 +10,11 @@ extern int32_t s_frameNum;       // frames taken in this gesture; OrientationCal
 extern int32_t s_lastFrameFlag;  // 1 after a frame without a finger; FingerStatus sets it
 extern int32_t s_tuneOkFlag;     // 1 when the last tuning call completed; Tune sets it
 
+// The frame tested last showed no finger.
+inline bool FingerLifted() {
+    return s_lastFrameFlag == 1;
+}
+
 }  // namespace fpnavi
 
 #endif  // FPNAVI_GESTURE_H

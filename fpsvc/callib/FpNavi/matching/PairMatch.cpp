@@ -8,6 +8,7 @@
 #include "frame/NaviFrame.h"
 #include "gesture/NaviVoteInfo.h"
 #include "matching/MatchSearch.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -28,7 +29,7 @@ int32_t JudgeMatch(const Move& move, int32_t diff) {
 
 void RecordMatch(const Move& move, int32_t diff) {
     const int32_t calc_cnt = PairCount(s_voteInfo);
-    const bool percent = s_dimensionlessFlag == 1 && s_sensorWidth > 0 && s_sensorHeight > 0;
+    const bool percent = TemplateInPercent() && s_sensorWidth > 0 && s_sensorHeight > 0;
     s_voteInfo.dx_fp[calc_cnt] = percent ? WrapMul(100, move.dx) / s_sensorWidth : move.dx;
     s_voteInfo.dy_fp[calc_cnt] = percent ? WrapMul(100, move.dy) / s_sensorHeight : move.dy;
     s_voteInfo.diff[calc_cnt] = diff;

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "base/NaviMath.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -69,7 +70,7 @@ bool PlacementsUsable(const SearchParams& params, const Placements& where, const
 SearchParams CurrentSearchParams() {
     return {s_imageWidth,   s_imageHeight,     s_boundWidth,
             s_boundHeight,  s_centerWidth,     s_centerHeight,
-            s_gapWidth,     s_gapHeight,       s_multiBloclkFlag == 1,
+            s_gapWidth,     s_gapHeight,       IsTiled(),
             s_tpltNum,      s_tpltWidthUD,     s_tpltHeightUD,
             s_tpltWidthLR,  s_tpltHeightLR,    WrapMul(s_templateHeight, s_templateWidth),
             s_candidateNum, s_overlapAreaMinFp};

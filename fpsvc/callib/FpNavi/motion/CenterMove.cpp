@@ -6,6 +6,7 @@
 #include "base/NaviSimd.h"
 #include "frame/NaviFrame.h"
 #include "gesture/NaviVoteInfo.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -18,7 +19,7 @@ bool Dominates(int32_t a, int32_t b) {
 
 // A large change of coverage for the way made: the finger is pressed or lifted, it does not slide.
 bool IsDeformation(int32_t dcvr, int32_t way) {
-    if (s_modeFlag != 1 || way == 0)
+    if (!IsHg() || way == 0)
         return false;
     const int32_t deform_rate = dcvr / way;
     return WrapAbs(deform_rate) > s_deformThreshold;
@@ -90,7 +91,7 @@ int32_t CalcCenterMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr,
     // Percentages: differences within +-100, so all products below stay small.
     int32_t dx = img_curr->xc - img_prev->xc;
     int32_t dy = img_curr->yc - img_prev->yc;
-    if (s_dimensionlessFlag == 0) {
+    if (CentroidInPixels()) {
         dx = dx * s_imageWidth / 100;
         dy = dy * s_imageHeight / 100;
     }

@@ -8,6 +8,7 @@
 #include <algorithm>
 #include <cstdint>
 
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -38,9 +39,9 @@ int64_t SearchWork(int64_t tpltWidth, int64_t tpltHeight) {
 }
 
 int64_t MatchWork() {
-    const bool multi = s_multiBloclkFlag == 1;
-    return CountProduct(s_candidateNum, CountProduct(multi ? s_fullImageWidth : s_imageWidth,
-                                                     multi ? s_fullImageHeight : s_imageHeight));
+    const bool tiled = IsTiled();
+    return CountProduct(s_candidateNum, CountProduct(tiled ? s_fullImageWidth : s_imageWidth,
+                                                     tiled ? s_fullImageHeight : s_imageHeight));
 }
 
 int64_t NoMoveWork() {
@@ -76,11 +77,11 @@ bool HgDetectGeometryUsable() {
 bool GestureGeometryUsable() {
     if (!ImageGeometryUsable())
         return false;
-    if (s_modeFlag == 1)  // the hg mode searches nothing
+    if (IsHg())  // the hg mode searches nothing
         return true;
     if (s_candidateNum < 1 || s_candidateNum > kCandidateMax)
         return false;
-    return s_multiBloclkFlag != 1 || FullImageGeometryUsable();
+    return !IsTiled() || FullImageGeometryUsable();
 }
 
 bool PairWorkAcceptable() {

@@ -2,6 +2,7 @@
 #include <iterator>
 
 #include "base/NaviMath.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -112,13 +113,13 @@ void StoreParams(const int32_t* params) {
 }
 
 void DeriveBlockGeometry() {
-    const bool hg = s_modeFlag == 1;
+    const bool hg = IsHg();
     s_blockWidth = hg ? s_blockWidthHg : s_blockWidthFp;
     s_blockHeight = hg ? s_blockHeightHg : s_blockHeightFp;
     s_blockColNum = hg ? s_blockColNumHg : s_blockColNumFp;
     s_blockRowNum = hg ? s_blockRowNumHg : s_blockRowNumFp;
     // Sticky: a process whose sensor has scanned twice keeps to it.
-    if (s_modeFlag == 2)
+    if (IsDoubleScan())
         s_doubleScanFlag = 1;
     s_imageHeight = WrapMul(s_blockRowNum, s_blockHeight);
     s_imageWidth = WrapMul(s_blockColNum, s_blockWidth);
@@ -130,11 +131,11 @@ int32_t FullSide(int32_t center, int32_t gap, int32_t bound) {
 }
 
 void DeriveMatchGeometry() {
-    const bool multi = s_multiBloclkFlag == 1;
+    const bool tiled = IsTiled();
     s_fullImageHeight =
-        multi ? FullSide(s_centerHeight, s_gapHeight, s_boundHeight) : s_centerHeight;
-    s_fullImageWidth = multi ? FullSide(s_centerWidth, s_gapWidth, s_boundWidth) : s_centerWidth;
-    s_tpltNum = multi ? 8 : 4;
+        tiled ? FullSide(s_centerHeight, s_gapHeight, s_boundHeight) : s_centerHeight;
+    s_fullImageWidth = tiled ? FullSide(s_centerWidth, s_gapWidth, s_boundWidth) : s_centerWidth;
+    s_tpltNum = tiled ? 8 : 4;
     s_tpltHeightUD = s_templateHeight;
     s_tpltWidthLR = s_templateHeight;
     s_tpltWidthUD = s_templateWidth;
@@ -152,7 +153,7 @@ int32_t SetNaviParam(const int32_t* params) {
     DeriveBlockGeometry();
     DeriveMatchGeometry();
     // Every second row only is scanned: what counts rows of the sensor is halved.
-    if (s_downSampleFlag == 1) {
+    if (IsDownSampled()) {
         s_sensorHeight /= 2;
         s_smallMoveTolRow /= 2;
     }

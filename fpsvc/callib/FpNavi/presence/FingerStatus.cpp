@@ -5,6 +5,7 @@
 #include "gesture/Gesture.h"
 #include "motion/DoubleScan.h"
 #include "param/NaviLimits.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "presence/FingerStatusFp.h"
 #include "presence/FingerStatusHg.h"
@@ -14,12 +15,12 @@ namespace {
 
 // 1, 0 or -1 as the entry. p_data is not null.
 int32_t DetectFinger(const uint8_t* p_data) {
-    if (s_doubleScanFlag == 1) {
+    if (ScansTwice()) {
         // An empty map is no finger even under a negative threshold.
         const int32_t coverage = DoubleScanFingerDetect(DoubleScanZoneCurr);
         return coverage > std::max(s_DoubleScanCvrThreshold, 0) ? 1 : 0;
     }
-    if (s_modeFlag == 1) {
+    if (IsHg()) {
         if (!ImageGeometryUsable() || !HgDetectGeometryUsable())
             return -1;
         return NavFingerDetectHg(p_data);

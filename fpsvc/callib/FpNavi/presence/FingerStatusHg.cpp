@@ -4,6 +4,7 @@
 
 #include "base/ByteSums.h"
 #include "base/NaviMath.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -50,7 +51,7 @@ int32_t NavFingerDetectHg(const uint8_t* p_data) {
     const int32_t mean = FrameSum(p_data, imgSize) / imgSize;
     if (mean <= s_meanThreshold)
         return 1;
-    if (s_highSensitiveMode != 1)
+    if (!IsHighSensitive())
         return 0;
     int32_t blkMeanMin = kMeanNone;
     GetBlkMeanMin(p_data, &blkMeanMin);

@@ -6,6 +6,7 @@
 
 #include "base/NaviMath.h"
 #include "gesture/Gesture.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "tuning/TuneMeasure.h"
 #include "tuning/TuneRegisters.h"
@@ -171,7 +172,7 @@ int32_t _NAVI_Tune(const uint8_t* img, int32_t /*img_width*/, int32_t /*img_heig
     using namespace fpnavi;
     if (img == nullptr || iTuneDAC == nullptr || iGain20 == nullptr || iGain2C == nullptr)
         return -1;
-    if (s_modeFlag == 1)
+    if (IsHg())
         return 1;
     _NAVI_TimeOut = WrapAdd(_NAVI_TimeOut, 1);
     sImgSizeInfo = {s_imageHeight, s_imageWidth};

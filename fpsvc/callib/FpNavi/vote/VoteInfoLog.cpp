@@ -10,10 +10,11 @@
 #pragma GCC diagnostic ignored "-Wformat-extra-args"
 
 // A list of eleven entries, one or two values each. Macros, since they are arguments of a printf.
-#define ELEVEN(a) a[0], a[1], a[2], a[3], a[4], a[5], a[6], a[7], a[8], a[9], a[10]
-#define ELEVEN_PAIRS(a, b)                                                                    \
-    a[0], b[0], a[1], b[1], a[2], b[2], a[3], b[3], a[4], b[4], a[5], b[5], a[6], b[6], a[7], \
-        b[7], a[8], b[8], a[9], b[9], a[10], b[10]
+#define ELEVEN(a) \
+    (a)[0], (a)[1], (a)[2], (a)[3], (a)[4], (a)[5], (a)[6], (a)[7], (a)[8], (a)[9], (a)[10]
+#define ELEVEN_PAIRS(a, b)                                                                  \
+    (a)[0], (b)[0], (a)[1], (b)[1], (a)[2], (b)[2], (a)[3], (b)[3], (a)[4], (b)[4], (a)[5], \
+        (b)[5], (a)[6], (b)[6], (a)[7], (b)[7], (a)[8], (b)[8], (a)[9], (b)[9], (a)[10], (b)[10]
 #define TEN_FORMATS " %d, %d, %d, %d, %d, %d, %d, %d, %d, %d\n"
 #define ELEVEN_PAIR_FORMATS \
     " {(%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d)"

@@ -1,6 +1,7 @@
 // Voting: when a vote is due, which mode votes, and what the host's settings make of the key.
 #include "base/NaviLog.h"
 #include "gesture/Gesture.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "vote/VotingFp.h"
 #include "vote/VotingHg.h"
@@ -10,9 +11,9 @@ namespace {
 
 // On the back of the device left and right are exchanged.
 int32_t MirrorForBack(int32_t vkey_value) {
-    if (s_sensorBackFlag == 1 && vkey_value == VKEY_RIGHT)
+    if (IsOnBack() && vkey_value == VKEY_RIGHT)
         return VKEY_LEFT;
-    if (s_sensorBackFlag == 1 && vkey_value == VKEY_LEFT)
+    if (IsOnBack() && vkey_value == VKEY_LEFT)
         return VKEY_RIGHT;
     return vkey_value;
 }
@@ -22,11 +23,11 @@ int32_t FilterDirection(int32_t vkey_value) {
     const bool horizontal = vkey_value == VKEY_RIGHT || vkey_value == VKEY_LEFT;
     const bool vertical = vkey_value == VKEY_UP || vkey_value == VKEY_DOWN;
     switch (s_directionControlFlag) {
-        case 0:
+        case kDirectionNone:
             return VKEY_NO_MOVE;
-        case 1:
+        case kDirectionVertical:
             return horizontal ? VKEY_NO_MOVE : vkey_value;
-        case 2:
+        case kDirectionHorizontal:
             return vertical ? VKEY_NO_MOVE : vkey_value;
         default:
             return vkey_value;
@@ -38,11 +39,11 @@ int32_t FilterDirection(int32_t vkey_value) {
 
 int32_t Voting(int32_t time_out) {
     using namespace fpnavi;
-    if (time_out != 1 && s_lastFrameFlag != 1)
+    if (time_out != 1 && !FingerLifted())
         return -1;
-    const int32_t voted = s_modeFlag == 1 ? Voting_hg_mode() : Voting_fp_mode();
+    const int32_t voted = IsHg() ? Voting_hg_mode() : Voting_fp_mode();
     const int32_t vkey_value = FilterDirection(MirrorForBack(voted));
-    if (s_logShowFlag == 1)
+    if (LogShown())
         NAVI_LOG("Voting", 498, "TQCODE -- TARQEN_FP_NAVI -- Voting - FINAL VKEY VALUE = %d!!\n",
                  vkey_value);
     return vkey_value;

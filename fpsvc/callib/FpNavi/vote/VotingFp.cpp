@@ -7,6 +7,7 @@
 #include "base/NaviMath.h"
 #include "gesture/Gesture.h"
 #include "gesture/NaviVoteInfo.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "vote/VoteInfoLog.h"
 
@@ -40,7 +41,7 @@ struct Tally {
 };
 
 Move CtMove(int32_t i) {
-    if (s_doubleScanFlag == 1)
+    if (ScansTwice())
         return {s_voteInfo.dx_ds[i], s_voteInfo.dy_ds[i]};
     return {s_voteInfo.dx_ct[i], s_voteInfo.dy_ct[i]};
 }
@@ -124,7 +125,7 @@ int32_t ChooseKey(const DirectionSums& fp, const DirectionSums& ct) {
                              MixScore(fp.right, ct.right), MixScore(fp.left, ct.left)};
     const int32_t score_max = *std::max_element(std::begin(score), std::end(score));
     const int32_t score_min = *std::min_element(std::begin(score), std::end(score));
-    if (score_min == score_max && s_open_vkey_none_navi == 1)
+    if (score_min == score_max && MayAnswerNone())
         return VKEY_NONE;
     int32_t vkey_value = VKEY_NONE;
     for (int32_t d = 0; d < 4; ++d) {
@@ -141,7 +142,7 @@ std::optional<int32_t> JudgeDistances(const Tally& tally, int32_t ct_final_dista
     const bool anyRest = tally.count_of_diff_result != 0;
     const bool hardlyMoved =
         ct_final_distance < s_ct_none_threshold && ct_final_distance > 0 && fp_final_distance == 0;
-    if (hardlyMoved && !anyRest && s_open_vkey_none_navi == 1)
+    if (hardlyMoved && !anyRest && MayAnswerNone())
         return VKEY_NONE;
     if (anyRest && fp_final_distance <= s_fpMoveThreshold &&
         ct_final_distance <= s_ct_not_move_threshold)
@@ -149,7 +150,7 @@ std::optional<int32_t> JudgeDistances(const Tally& tally, int32_t ct_final_dista
     const int32_t final_ct_and_fp = WrapAdd(ct_final_distance, fp_final_distance);
     const bool oneMovingPair = calc_cnt - tally.count_of_diff_result <= 1;
     if (calc_cnt == 0 || final_ct_and_fp <= s_totalMoveThreshold ||
-        (oneMovingPair && s_directionControlFlag == 1))
+        (oneMovingPair && s_directionControlFlag == kDirectionVertical))
         return VKEY_NO_MOVE;
     return std::nullopt;
 }
@@ -157,7 +158,7 @@ std::optional<int32_t> JudgeDistances(const Tally& tally, int32_t ct_final_dista
 }  // namespace
 
 int32_t Voting_fp_mode() {
-    if (s_logShowFlag == 1)
+    if (LogShown())
         LogVoteInfo();
     const std::optional<Tally> tally = TallyPairs();
     if (!tally)
@@ -167,7 +168,7 @@ int32_t Voting_fp_mode() {
     if (const auto decided = JudgeDistances(*tally, ct_final_distance, fp_final_distance))
         return *decided;
     // The finger is still down after a short way: a long press.
-    if (s_lastFrameFlag == 0 && ct_final_distance < s_totalMoveThresholdLongpressCt &&
+    if (!FingerLifted() && ct_final_distance < s_totalMoveThresholdLongpressCt &&
         fp_final_distance < s_totalMoveThresholdLongpressFp)
         return VKEY_NO_MOVE;
     return ChooseKey(tally->method_fp, tally->method_ct);
