@@ -249,7 +249,7 @@ std::vector<uint8_t> RandomTypes(SimRandom& random, FrameSize size) {
 TwinFrame::TwinFrame(FrameSize size, const std::vector<uint8_t>& greys,
                      const std::vector<uint8_t>& types)
     : m_greys(greys), m_types(types), m_greysPlain(greys), m_typesPlain(types) {
-    // The room behind the pixels, with junk in it.
+    // The space behind the pixels, with junk in it.
     const size_t bytes = static_cast<size_t>(fpnavi::FrameBytes(size.width, size.height));
     m_greys.resize(bytes, 99);
     m_types.resize(bytes, 1);

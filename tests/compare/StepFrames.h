@@ -1,5 +1,6 @@
 // Frames for the comparison of single steps: ridge-like and hostile greys, class maps with other
-// bytes than 0 and 1, sizes around the limits of the fast paths. Everything follows from a seed.
+// bytes than 0 and 1, sizes around those of the module's steps (16 bytes, 64 columns). Everything
+// follows from a seed.
 #ifndef TESTS_COMPARE_STEPFRAMES_H
 #define TESTS_COMPARE_STEPFRAMES_H
 
@@ -56,8 +57,9 @@ std::vector<uint8_t> NextGreys(host::SimRandom& random, const std::vector<uint8_
 // Class maps: full, empty, outlines, noise; also with the classes 2 and 255.
 std::vector<uint8_t> RandomTypes(host::SimRandom& random, FrameSize size);
 
-// The same frame for both sides, each with heap buffers of exactly its size. Measures start as
-// numbers that no step leaves there by chance.
+// The same frame for module and model, each with heap buffers of its own; the module's have the
+// space behind the pixels (FrameBytes), filled with junk. Measures start as numbers that no step
+// leaves there by chance.
 class TwinFrame {
   public:
     TwinFrame(FrameSize size, const std::vector<uint8_t>& greys, const std::vector<uint8_t>& types);

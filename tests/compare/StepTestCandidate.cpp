@@ -115,7 +115,7 @@ TEST(StepFindCandidate, PeriodicFramesGiveTheSameArrays) {
     });
 }
 
-// Every template of 1..20 x 1..20 pixels on one frame: the tables end at 64 pixels and 16 columns.
+// Every template of 1..20 x 1..20 pixels on one frame: pieces end at 64 pixels and 16 columns.
 TEST(StepFindCandidate, EveryTemplateSizeGivesTheSameArrays) {
     const FrameSize size = {56, 50};
     SimRandom random = StepRandom(314, 0);

@@ -24,7 +24,7 @@ using host::ParamBlock;
 using host::ParamValue;
 using host::SimRandom;
 
-// Template sizes at the limits of the tabulated search: 64 pixels, 16 columns.
+// Template sizes at the limits of a piece: 64 pixels, 16 columns.
 constexpr int32_t kTemplateSizes[][2] = {{12, 5}, {16, 4}, {17, 3}, {8, 8},  {13, 5},
                                          {16, 1}, {17, 1}, {1, 16}, {5, 13}, {4, 16}};
 

@@ -126,7 +126,7 @@ TEST(StepCalcBiThrTrap, LargeFramesOfNoiseWrapAlike) {
     }
 }
 
-// 64 pixels fill a word; 65 take the general path.
+// 64 pixels fill a word, 65 take two.
 TEST(StepGetFingerRidgeTrap, SidesOf64And65SpanFromTheFirstPixelToTheLast) {
     for (const FrameSize size : {FrameSize{64, 64}, FrameSize{65, 64}, FrameSize{64, 65}}) {
         std::vector<uint8_t> greys = FlatBytes(size, 9);
