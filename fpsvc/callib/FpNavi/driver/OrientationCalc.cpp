@@ -37,8 +37,8 @@ int32_t NextFrame(const uint8_t* data) {
     return OrntCalcProcess();
 }
 
-// A frame starts with measures of 0, and only GetCenterAndCoverage changes them. Measuring a frame
-// again whose measures are all 0 gives the same zeros.
+// A frame starts with measures of 0, and only GetCenterAndCoverage changes them. So a frame whose
+// measures are all 0 is not measured yet, or measuring it again gives the same zeros.
 bool IsMeasured(const NaviFrame_t& img) {
     return img.cvr != 0 || img.xc != 0 || img.yc != 0;
 }
