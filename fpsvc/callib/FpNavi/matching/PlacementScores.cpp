@@ -23,7 +23,8 @@ constexpr int32_t kGroups[kTpltMax / kAlike][kAlike] = {{0, 1, 4, 5}, {2, 3, 6, 
 
 // Divides sums of pixels greys by their number, at most 2^24. With the reciprocal in units of
 // 1/2^56, rounded up, the product exceeds the quotient by less than 255 * 2^24 / 2^56 < 1 / 2^24 <=
-// 1 / pixels: the truncated quotient is exact. It is at most 255 * 2^56 + 2^32 < 2^64.
+// 1 / pixels: the truncated quotient is exact. The product is below 255 * 2^56 + 2^32 <
+// 2^64.
 struct MeanOf {
     explicit MeanOf(int32_t pixels)
         : reciprocal(((uint64_t{1} << 56) - 1) / static_cast<uint64_t>(pixels) + 1) {}
