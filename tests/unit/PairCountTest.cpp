@@ -10,7 +10,7 @@
 #include "LogCapture.h"
 #include "frame/NaviFrame.h"
 #include "gesture/NaviVoteInfo.h"
-#include "matching/ImgJoint.h"
+#include "matching/PairMatch.h"
 #include "motion/CenterMove.h"
 #include "motion/DoubleScan.h"
 #include "param/NaviParam.h"
