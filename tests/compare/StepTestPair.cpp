@@ -5,10 +5,12 @@
 #include <cstring>
 
 #include "Twin.h"
+#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
 #include "matching/CandidateHeap.h"
 #include "matching/CandidateSearch.h"
+#include "matching/DisplacementScore.h"
 #include "matching/MatchSearch.h"
 #include "matching/PairMatch.h"
 #include "matching/PlacementScores.h"
@@ -84,6 +86,20 @@ void LoadPair(const PairBytes& pair) {
     LoadFrame(&fpnavi::s_imagePrev, &reference::s_imagePrev, pair.prevGreys, pair.prevTypes);
     LoadFrame(&fpnavi::s_imageCurr, &reference::s_imageCurr, pair.currGreys, pair.currTypes);
     MeasurePair();
+}
+
+bool LoadMatchPair(const ParamBlock& params, const PairBytes& pair) {
+    SetStepParams(params);
+    LoadPair(pair);
+    if (ParamValue(params, "s_multiBloclkFlag") != 1)
+        return true;
+    const bool built = fpnavi::GetFullImg(&fpnavi::s_imagePrev, &fpnavi::s_fullImagePrev) == 0 &&
+                       fpnavi::GetFullImg(&fpnavi::s_imageCurr, &fpnavi::s_fullImageCurr) == 0;
+    const bool builtPlain =
+        reference::GetFullImg(&reference::s_imagePrev, &reference::s_fullImagePrev) == 0 &&
+        reference::GetFullImg(&reference::s_imageCurr, &reference::s_fullImageCurr) == 0;
+    EXPECT_EQ(built, builtPlain);
+    return built;
 }
 
 void LoadPreProcessed(const PairBytes& pair) {
@@ -239,6 +255,18 @@ int32_t PlainScore(int32_t di, int32_t dj) {
     const int32_t score = PlainMatch({di}, {dj}).difference;
     reference::s_candidateNum = num;
     return score;
+}
+
+int32_t ModuleScore(int32_t di, int32_t dj, int32_t most) {
+    const fpnavi::FramePair pair = fpnavi::LayOutPair(fpnavi::s_imagePrev, fpnavi::s_imageCurr);
+    fpnavi::DisplacementScore score(fpnavi::CurrentSearchParams(), pair);
+    return score.At({di, dj}, most);
+}
+
+FrameSize ComparedSize() {
+    if (fpnavi::s_multiBloclkFlag == 1)
+        return {fpnavi::s_fullImageWidth, fpnavi::s_fullImageHeight};
+    return {fpnavi::s_imageWidth, fpnavi::s_imageHeight};
 }
 
 JointOutcome CalcJoint() {

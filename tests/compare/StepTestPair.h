@@ -36,6 +36,10 @@ struct PairBytes {
 PairBytes RandomPair(host::SimRandom& random, FrameSize size);
 void LoadPair(const PairBytes& pair);
 
+// The same under params, with full images where these ask for them. Returns false when the full
+// images cannot be built.
+bool LoadMatchPair(const host::ParamBlock& params, const PairBytes& pair);
+
 // What the module's frames have behind their pixels when they are loaded: value, see FillRoom.
 void SetRoomJunk(int32_t value);
 
@@ -88,6 +92,12 @@ MatchResult ModuleMatch(const std::vector<int32_t>& di, const std::vector<int32_
 MatchResult PlainMatch(const std::vector<int32_t>& di, const std::vector<int32_t>& dj);
 // What the plain model scores for this displacement alone.
 int32_t PlainScore(int32_t di, int32_t dj);
+
+// What the module scores for it, exact up to most.
+int32_t ModuleScore(int32_t di, int32_t dj, int32_t most = 256);
+
+// The sides of the frames that are compared: full images where there are any.
+FrameSize ComparedSize();
 
 // CalcImgJoint of both, and what the module left at the record's first entry.
 struct JointOutcome {
