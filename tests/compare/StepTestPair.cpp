@@ -155,6 +155,13 @@ int32_t NoMove(TwinFrame* prev, TwinFrame* curr) {
     return module;
 }
 
+int32_t NoMoveOfPair() {
+    const int32_t module = fpnavi::FingerNoMove(&fpnavi::s_imagePrev, &fpnavi::s_imageCurr);
+    EXPECT_EQ(module, ModuleOutcome(reference::FingerNoMove(&reference::s_imagePrev,
+                                                            &reference::s_imageCurr)));
+    return module;
+}
+
 namespace {
 
 template <typename Find>

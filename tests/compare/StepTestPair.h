@@ -52,6 +52,9 @@ void LoadPreProcessed(const PairBytes& pair);
 // FingerNoMove of both sides, which must agree, in the module's numbers.
 int32_t NoMove(TwinFrame* prev, TwinFrame* curr);
 
+// The same of the current pair.
+int32_t NoMoveOfPair();
+
 struct Candidates {
     int32_t result = 0;
     std::vector<int32_t> di;

@@ -125,6 +125,37 @@ TEST(StepStretchRange, EverySpanAndScaleRoundsTheSame) {
     }
 }
 
+// 50 pixels of grey 10, 45 of 20 and 5 of 200, a tenth cut off at each end: more than 10 pixels lie
+// up to grey 10, which makes 9 the least, and 90 up to grey 20, the largest. Scale 100 stretches 1
+// to 100 / 11 and 11 to 100; 191 gives 1736, which is clamped at 255 and not at the scale.
+TEST(StepStretchRange, GreysAboveThePercentileClampAt255NotAtTheScale) {
+    SetStepParams({8, 8}, {{"s_cutOffPercent", 10}});
+    const FrameSize size = {100, 1};
+    std::vector<uint8_t> greys(50, 10);
+    greys.resize(95, 20);
+    greys.resize(100, 200);
+    TwinFrame twin(size, greys, FlatBytes(size, 1));
+    ASSERT_EQ(fpnavi::StretchRange(twin.Module(), 100), 0);
+    ASSERT_EQ(reference::StretchRange(twin.Plain(), 100), 0);
+    EXPECT_TRUE(twin.Same());
+    EXPECT_EQ(twin.Module()->pData[0], 9);
+    EXPECT_EQ(twin.Module()->pData[94], 100);
+    EXPECT_EQ(twin.Module()->pData[99], 255);
+}
+
+// A smaller share of bright pixels than is cut off, below every scale.
+TEST(StepStretchRange, EveryScaleClampsAlike) {
+    for (int32_t scale = 0; scale < 256; ++scale) {
+        SimRandom random = StepRandom(122, scale);
+        SetStepParams({8, 8}, {{"s_cutOffPercent", random.Range(1, 40)}});
+        const FrameSize size = RandomSize(random);
+        TwinFrame twin(size, RandomGreys(random, size), FlatBytes(size, 1));
+        ASSERT_EQ(fpnavi::StretchRange(twin.Module(), static_cast<uint8_t>(scale)), 0);
+        ASSERT_EQ(reference::StretchRange(twin.Plain(), static_cast<uint8_t>(scale)), 0);
+        ASSERT_TRUE(twin.Same()) << "scale " << scale;
+    }
+}
+
 TEST(StepImgPreProcess, RandomFramesComeOutTheSame) {
     const int64_t cases = StepCases(16000);
     WordClasses words;
