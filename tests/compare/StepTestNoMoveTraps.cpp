@@ -19,9 +19,11 @@ class StepFingerNoMoveTrap : public ::testing::TestWithParam<FrameSize> {
   protected:
     static constexpr int32_t kBound = 2;
 
-    FrameSize Size() const { return GetParam(); }
+    static FrameSize Size() { return GetParam(); }
     // Pixels that are compared without a shift: all but the corners.
-    int32_t Compared() const { return static_cast<int32_t>(Size().Pixels()) - 4 * kBound * kBound; }
+    static int32_t Compared() {
+        return static_cast<int32_t>(Size().Pixels()) - 4 * kBound * kBound;
+    }
 
     int32_t Outcome(ParamChanges changes, const std::vector<uint8_t>& prevGreys,
                     const std::vector<uint8_t>& currGreys, uint8_t type = 1) {
