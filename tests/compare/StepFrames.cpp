@@ -131,16 +131,6 @@ SimRandom StepRandom(uint64_t test, int64_t index) {
     return SimRandom(host::Mix64(start));
 }
 
-FrameSize RandomSize(SimRandom& random) {
-    const auto side = [&random] {
-        if (random.Chance(4))
-            return random.Range(71, 200);
-        return random.Chance(20) ? random.Range(63, 65) : random.Range(1, 70);
-    };
-    const int32_t width = side();
-    return {width, width > 70 ? random.Range(1, 40) : side()};
-}
-
 int32_t RandomThreshold(SimRandom& random, int32_t low, int32_t high) {
     constexpr int32_t kBoundaries[] = {
         std::numeric_limits<int32_t>::min(), -1, 0, 1, 254, 255, 256, 257,
@@ -246,15 +236,25 @@ std::vector<uint8_t> RandomTypes(SimRandom& random, FrameSize size) {
     }
 }
 
+void FillRoom(::NaviFrame_t* img, int32_t value) {
+    const int32_t bytes = fpnavi::FrameBytes(img->width, img->height);
+    SimRandom random(static_cast<uint64_t>(bytes));
+    for (int32_t p = img->width * img->height; p < bytes; ++p) {
+        const uint64_t junk = value < 0 ? random.Next() : static_cast<uint64_t>(value) * 257;
+        img->pData[p] = static_cast<uint8_t>(junk & 255U);
+        img->pType[p] = static_cast<uint8_t>(junk >> 8 & 255U);
+    }
+}
+
 TwinFrame::TwinFrame(FrameSize size, const std::vector<uint8_t>& greys,
                      const std::vector<uint8_t>& types)
     : m_greys(greys), m_types(types), m_greysPlain(greys), m_typesPlain(types) {
-    // The space behind the pixels, with junk in it.
     const size_t bytes = static_cast<size_t>(fpnavi::FrameBytes(size.width, size.height));
-    m_greys.resize(bytes, 99);
-    m_types.resize(bytes, 1);
+    m_greys.resize(bytes);
+    m_types.resize(bytes);
     m_module = {size.width, size.height, m_greys.data(), m_types.data(), -7, 9, -11, -13};
     m_plain = {size.width, size.height, m_greysPlain.data(), m_typesPlain.data(), -7, 9, -11, -13};
+    FillRoom(&m_module, greys.front() % 2 == 0 ? 1 : kRandomJunk);  // class 1 would be finger
 }
 
 ::testing::AssertionResult TwinFrame::Same() const {

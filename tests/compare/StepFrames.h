@@ -1,6 +1,5 @@
 // Frames for the comparison of single steps: ridge-like and hostile greys, class maps with other
-// bytes than 0 and 1, sizes around those of the module's steps (16 bytes, 64 columns). Everything
-// follows from a seed.
+// bytes than 0 and 1. Everything follows from a seed.
 #ifndef TESTS_COMPARE_STEPFRAMES_H
 #define TESTS_COMPARE_STEPFRAMES_H
 
@@ -12,6 +11,7 @@
 #include "FpNavi.h"
 #include "Reference.h"
 #include "SimMath.h"
+#include "StepSizes.h"
 
 namespace fpnavi_test {
 
@@ -21,16 +21,6 @@ int64_t StepCases(int64_t count);
 
 // The random numbers of one case; FPNAVI_COMPARE_SEED gives others.
 host::SimRandom StepRandom(uint64_t test, int64_t index);
-
-struct FrameSize {
-    int32_t width;
-    int32_t height;
-
-    size_t Pixels() const { return static_cast<size_t>(width) * static_cast<size_t>(height); }
-};
-
-// Sides of 1..70, often 63..65, seldom up to 200.
-FrameSize RandomSize(host::SimRandom& random);
 
 // Mostly low..high, else a boundary of the type or of grey levels.
 int32_t RandomThreshold(host::SimRandom& random, int32_t low, int32_t high);
@@ -57,9 +47,13 @@ std::vector<uint8_t> NextGreys(host::SimRandom& random, const std::vector<uint8_
 // Class maps: full, empty, outlines, noise; also with the classes 2 and 255.
 std::vector<uint8_t> RandomTypes(host::SimRandom& random, FrameSize size);
 
-// The same frame for module and model, each with heap buffers of its own; the module's have the
-// space behind the pixels (FrameBytes), filled with junk. Measures start as numbers that no step
-// leaves there by chance.
+// Fills the space behind the pixels of both buffers: with value, or, below 0, with random bytes.
+constexpr int32_t kRandomJunk = -1;
+void FillRoom(::NaviFrame_t* img, int32_t value);
+
+// The same frame for both sides, each with heap buffers of exactly the bytes that its steps may
+// touch; the space behind the module's pixels is full of junk. Measures start as numbers that no
+// step leaves there by chance.
 class TwinFrame {
   public:
     TwinFrame(FrameSize size, const std::vector<uint8_t>& greys, const std::vector<uint8_t>& types);
@@ -68,7 +62,7 @@ class TwinFrame {
 
     ::NaviFrame_t* Module() { return &m_module; }
     reference::NaviFrame_t* Plain() { return &m_plain; }
-    // All bytes of both buffers and all measures are equal.
+    // All pixels of both buffers and all measures are equal.
     ::testing::AssertionResult Same() const;
 
   private:

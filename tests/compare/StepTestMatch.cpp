@@ -1,5 +1,5 @@
-// The full image and the scores of displacements against the plain model, both of the general match
-// and of the one tile by tile.
+// The full image, the match of given displacements and the score of each against the plain model,
+// which reads the full images, where the module lets tiles meet.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -60,29 +60,6 @@ TEST(StepGetFullImg, RandomTilesGiveTheSameBuffers) {
     EXPECT_GT(built, cases / 2);
 }
 
-// A state with full images where the parameters ask for them. Returns false when they cannot be
-// built.
-bool LoadMatchFrames(SimRandom& random, const host::ParamBlock& params) {
-    SetStepParams(params);
-    LoadPair(RandomPair(random, SizeOf(params)));
-    if (ParamValue(params, "s_multiBloclkFlag") != 1)
-        return true;
-    const bool built = fpnavi::GetFullImg(&fpnavi::s_imagePrev, &fpnavi::s_fullImagePrev) == 0 &&
-                       fpnavi::GetFullImg(&fpnavi::s_imageCurr, &fpnavi::s_fullImageCurr) == 0;
-    const bool builtPlain =
-        reference::GetFullImg(&reference::s_imagePrev, &reference::s_fullImagePrev) == 0 &&
-        reference::GetFullImg(&reference::s_imageCurr, &reference::s_fullImageCurr) == 0;
-    EXPECT_EQ(built, builtPlain);
-    return built;
-}
-
-// Both sides of the frames that are compared, full images where there are any.
-FrameSize ComparedSize() {
-    if (fpnavi::s_multiBloclkFlag == 1)
-        return {fpnavi::s_fullImageWidth, fpnavi::s_fullImageHeight};
-    return {fpnavi::s_imageWidth, fpnavi::s_imageHeight};
-}
-
 int32_t RandomDisplacement(SimRandom& random, int32_t side) {
     if (random.Chance(2))
         return random.Chance(50) ? std::numeric_limits<int32_t>::min()
@@ -94,11 +71,13 @@ int32_t RandomDisplacement(SimRandom& random, int32_t side) {
 
 TEST(StepFindMatch, RandomDisplacementsGiveTheSameBest) {
     const int64_t cases = StepCases(4000);
+    SearchClasses classes;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(411, i);
         const host::ParamBlock params = RandomSearchParams(random, RandomSize(random));
-        if (!LoadMatchFrames(random, params))
+        if (!LoadMatchPair(params, RandomPair(random, SizeOf(params))))
             continue;
+        classes.Note(params);
         const FrameSize compared = ComparedSize();
         const size_t num = static_cast<size_t>(fpnavi::s_candidateNum);
         std::vector<int32_t> di(num);
@@ -110,14 +89,7 @@ TEST(StepFindMatch, RandomDisplacementsGiveTheSameBest) {
         ASSERT_EQ(ModuleMatch(di, dj), PlainMatch(di, dj)) << "case " << i;
         ASSERT_TRUE(SameState()) << "case " << i;
     }
-}
-
-// What the module scores for a displacement of the current pair.
-int32_t ModuleScore(int32_t di, int32_t dj, int32_t most) {
-    const fpnavi::FramePair pair = fpnavi::LayOutPair(fpnavi::s_imagePrev, fpnavi::s_imageCurr);
-    fpnavi::ColumnMeetings columns;
-    fpnavi::DisplacementScore score(fpnavi::CurrentSearchParams(), pair, &columns, 1);
-    return score.At({di, dj}, most);
+    classes.ExpectAll();
 }
 
 // The score of a displacement tile by tile: exact up to most, only "above" beyond it.
@@ -134,15 +106,16 @@ void CompareScore(int32_t di, int32_t dj, int32_t score) {
     }
 }
 
-TEST(StepMatchAt, RandomDisplacementsOfTilesGiveTheSameScore) {
+TEST(StepDisplacementScore, RandomDisplacementsOfTilesGiveTheSameScore) {
     const int64_t cases = StepCases(12000);
     int64_t scores = 0;
+    SearchClasses classes;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(421, i);
         const host::ParamBlock params = RandomSearchParams(random, RandomSize(random));
-        const bool loaded = LoadMatchFrames(random, params);
-        if (!loaded)
+        if (!LoadMatchPair(params, RandomPair(random, SizeOf(params))))
             continue;
+        classes.Note(params);
         const FrameSize compared = ComparedSize();
         for (int32_t n = 0; n < 8; ++n, ++scores) {
             const int32_t di = random.Chance(60) ? random.Range(-10, 10)
@@ -154,11 +127,12 @@ TEST(StepMatchAt, RandomDisplacementsOfTilesGiveTheSameScore) {
                 << "case " << i << ", displacement " << di << ", " << dj;
         }
     }
+    classes.ExpectAll();
     RecordProperty("scores", static_cast<int>(scores));
 }
 
 // All displacements of small frames, at which every pair of tiles meets.
-TEST(StepMatchAt, EveryDisplacementOfSmallFramesGivesTheSameScore) {
+TEST(StepDisplacementScore, EveryDisplacementOfSmallFramesGivesTheSameScore) {
     const int64_t cases = StepCases(200) / 4;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(422, i);
@@ -166,7 +140,7 @@ TEST(StepMatchAt, EveryDisplacementOfSmallFramesGivesTheSameScore) {
         host::ParamBlock params = RandomSearchParams(random, size);
         const int32_t bound = random.Range(0, std::min(size.width, size.height) / 2);
         SetTiles(params, size, bound, random.Range(0, 6));
-        if (!LoadMatchFrames(random, params))
+        if (!LoadMatchPair(params, RandomPair(random, SizeOf(params))))
             continue;
         const FrameSize compared = ComparedSize();
         for (int32_t di = -compared.height - 1; di <= compared.height + 1; ++di) {
@@ -179,48 +153,8 @@ TEST(StepMatchAt, EveryDisplacementOfSmallFramesGivesTheSameScore) {
     }
 }
 
-// Displacements of the whole side and beyond, at the sides where a row fills its word.
-TEST(StepMatchAt, SidesOf63And64AtTheirFarthestDisplacements) {
-    SimRandom random = StepRandom(423, 0);
-    for (const FrameSize size : {FrameSize{63, 64}, FrameSize{64, 63}, FrameSize{64, 64}}) {
-        for (const int32_t multi : {0, 1}) {
-            host::ParamBlock params = host::ParamsForMode(host::Mode::Fp, false);
-            SetTiles(params, size, 8, multi * 4);
-            ParamValue(params, "s_multiBloclkFlag") = multi;
-            ParamValue(params, "s_overlapAreaMinFp") = 0;
-            ASSERT_TRUE(LoadMatchFrames(random, params));
-            for (const int32_t di : {-72, -71, -65, -64, -63, -62, 0, 62, 63, 64, 65, 70, 71, 72}) {
-                for (const int32_t dj : {-72, -65, -64, -63, -1, 0, 1, 63, 64, 65, 71, 72})
-                    ASSERT_EQ(ModuleScore(di, dj, 256), PlainScore(di, dj))
-                        << di << ", " << dj << ", multi " << multi;
-            }
-        }
-    }
-}
-
-// Black against a flat grey: the sum reaches its limit with the last pixel, or not at all.
-TEST(StepMatchAtTrap, EarlyStopIsExactAtTheLimit) {
-    const FrameSize size = {40, 30};
-    host::ParamBlock params = host::ParamsForMode(host::Mode::Fp, false);
-    SetTiles(params, size, 8, 4);
-    SetStepParams(params);
-    for (const int32_t grey : {1, 9, 100, 254, 255}) {
-        std::vector<uint8_t> greys = FlatBytes(size, static_cast<uint8_t>(grey));
-        for (const bool oneLess : {false, true}) {
-            greys.back() = static_cast<uint8_t>(oneLess ? grey - 1 : grey);
-            LoadPair({FlatBytes(size, 0), FlatBytes(size, 1), greys, FlatBytes(size, 1)});
-            const int32_t score = oneLess ? grey - 1 : grey;
-            ASSERT_EQ(ModuleScore(0, 0, score), score);
-            if (score > 0) {
-                ASSERT_GT(ModuleScore(0, 0, score - 1), score - 1);
-            }
-            ASSERT_EQ(ModuleScore(0, 0, 256), score);
-        }
-    }
-}
-
 // The match asks for more than its minimum, where the no-move test takes exactly that.
-TEST(StepMatchAtTrap, AreaOfExactlyTheMinimumIsTooLittle) {
+TEST(StepDisplacementScoreTrap, AreaOfExactlyTheMinimumIsTooLittle) {
     const FrameSize size = {40, 30};
     for (const int32_t multi : {0, 1}) {
         for (const int32_t beyond : {-1, 0, 1}) {
@@ -230,16 +164,9 @@ TEST(StepMatchAtTrap, AreaOfExactlyTheMinimumIsTooLittle) {
             ParamValue(params, "s_multiBloclkFlag") = multi;
             ParamValue(params, "s_overlapAreaMinFp") = pixels + beyond;
             ParamValue(params, "s_candidateNum") = 1;
-            SimRandom random = StepRandom(424, 0);
-            ASSERT_TRUE(LoadMatchFrames(random, params));
             const std::vector<uint8_t> greys = FlatBytes(size, 77);
-            LoadPair({greys, FlatBytes(size, 1), greys, FlatBytes(size, 1)});
-            if (multi == 1) {
-                fpnavi::GetFullImg(&fpnavi::s_imagePrev, &fpnavi::s_fullImagePrev);
-                fpnavi::GetFullImg(&fpnavi::s_imageCurr, &fpnavi::s_fullImageCurr);
-                reference::GetFullImg(&reference::s_imagePrev, &reference::s_fullImagePrev);
-                reference::GetFullImg(&reference::s_imageCurr, &reference::s_fullImageCurr);
-            }
+            ASSERT_TRUE(
+                LoadMatchPair(params, {greys, FlatBytes(size, 1), greys, FlatBytes(size, 1)}));
             const int32_t expected = beyond < 0 ? 0 : 255;
             EXPECT_EQ(ModuleScore(0, 0, 256), expected) << "multi " << multi;
             EXPECT_EQ(ModuleMatch({0}, {0}).difference, expected) << "multi " << multi;

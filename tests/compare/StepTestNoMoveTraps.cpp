@@ -1,5 +1,5 @@
-// What the fast no-move test could get wrong: each case is made for one mistake and runs on a frame
-// of the word-wide path, on the widest of these and on one beyond it.
+// What the no-move test could get wrong: each case is made for one mistake and runs on frames
+// either side of one step of sixteen, one word of 64 and two, in both axes.
 #include <gtest/gtest.h>
 
 #include <limits>
@@ -15,12 +15,11 @@ using host::SimRandom;
 
 constexpr int32_t kNoLimit = std::numeric_limits<int32_t>::max();
 
-// The parameter is the frame's width.
-class StepFingerNoMoveTrap : public ::testing::TestWithParam<int32_t> {
+class StepFingerNoMoveTrap : public ::testing::TestWithParam<FrameSize> {
   protected:
     static constexpr int32_t kBound = 2;
 
-    static FrameSize Size() { return {GetParam(), 20}; }
+    static FrameSize Size() { return GetParam(); }
     // Pixels that are compared without a shift: all but the corners.
     static int32_t Compared() {
         return static_cast<int32_t>(Size().Pixels()) - 4 * kBound * kBound;
@@ -137,7 +136,15 @@ TEST_P(StepFingerNoMoveTrap, RestAtTheFarthestShiftIsFound) {
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Widths, StepFingerNoMoveTrap, ::testing::Values(40, 64, 65));
+std::vector<FrameSize> LongSizes(bool wide) {
+    std::vector<FrameSize> sizes;
+    for (const int32_t side : kEdges)
+        sizes.push_back(wide ? FrameSize{side, 20} : FrameSize{20, side});
+    return sizes;
+}
+
+INSTANTIATE_TEST_SUITE_P(Widths, StepFingerNoMoveTrap, ::testing::ValuesIn(LongSizes(true)));
+INSTANTIATE_TEST_SUITE_P(Heights, StepFingerNoMoveTrap, ::testing::ValuesIn(LongSizes(false)));
 
 }  // namespace
 }  // namespace fpnavi_test

@@ -3,13 +3,14 @@
 #include <algorithm>
 #include <cstdlib>
 #include <cstring>
-#include <iterator>
 
 #include "Twin.h"
+#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
 #include "matching/CandidateHeap.h"
 #include "matching/CandidateSearch.h"
+#include "matching/DisplacementScore.h"
 #include "matching/MatchSearch.h"
 #include "matching/PairMatch.h"
 #include "matching/PlacementScores.h"
@@ -24,40 +25,8 @@ using host::ParamBlock;
 using host::ParamValue;
 using host::SimRandom;
 
-// Template sizes at the limits of a piece: 64 pixels, 16 columns.
-constexpr int32_t kTemplateSizes[][2] = {{12, 5}, {16, 4}, {17, 3}, {8, 8},  {13, 5},
-                                         {16, 1}, {17, 1}, {1, 16}, {5, 13}, {4, 16}};
-
-struct TemplateSize {
-    int32_t width;
-    int32_t height;
-};
-
-TemplateSize RandomTemplate(SimRandom& random, FrameSize size, int32_t bound) {
-    if (random.Chance(30)) {
-        const auto& known =
-            kTemplateSizes[random.Below(static_cast<int32_t>(std::size(kTemplateSizes)))];
-        return {known[0], known[1]};
-    }
-    if (random.Chance(20))
-        return {random.Range(1, 20), random.Range(1, 20)};
-    const int32_t least = std::min(size.width, size.height);
-    return {random.Range(1, std::clamp(least, 1, 20)), random.Range(1, std::clamp(bound, 1, 8))};
-}
-
-// Byte comparisons of the plain model's searches.
-bool CheapSearch(const ParamBlock& params) {
-    const auto value = [&params](const char* name) {
-        return static_cast<double>(ParamValue(params, name));
-    };
-    const double full =
-        (value("s_centerWidth") + 2 * (value("s_gapWidth") + value("s_boundWidth"))) *
-        (value("s_centerHeight") + 2 * (value("s_gapHeight") + value("s_boundHeight")));
-    const double search = 8 * std::max(value("s_centerWidth"), 1.0) *
-                          std::max(value("s_centerHeight"), 1.0) * value("s_templateWidth") *
-                          value("s_templateHeight");
-    return search < 2e6 && full * value("s_candidateNum") < 1e6 && full < 4e5;
-}
+// What FillRoom takes.
+int32_t s_roomJunk = kRandomJunk;
 
 void LoadFrame(::NaviFrame_t* module, reference::NaviFrame_t* plain,
                const std::vector<uint8_t>& greys, const std::vector<uint8_t>& types) {
@@ -69,6 +38,7 @@ void LoadFrame(::NaviFrame_t* module, reference::NaviFrame_t* plain,
     ASSERT_EQ(reference::ImgInit(plain, 0, height, 0, width, greys.data()), 0);
     std::memcpy(module->pType, types.data(), types.size());
     std::memcpy(plain->pType, types.data(), types.size());
+    FillRoom(module, s_roomJunk);
 }
 
 void MeasurePair() {
@@ -80,21 +50,12 @@ void MeasurePair() {
 
 }  // namespace
 
-void SetStepParams(const ParamBlock& params) {
-    Twin::Get().SetParam(&params);
+void SetRoomJunk(int32_t value) {
+    s_roomJunk = value;
 }
 
-void SetTiles(ParamBlock& params, FrameSize size, int32_t bound, int32_t gap) {
-    ParamValue(params, "s_blockWidthFp") = size.width;
-    ParamValue(params, "s_blockHeightFp") = size.height;
-    ParamValue(params, "s_blockColNumFp") = 1;
-    ParamValue(params, "s_blockRowNumFp") = 1;
-    ParamValue(params, "s_boundWidth") = bound;
-    ParamValue(params, "s_boundHeight") = bound;
-    ParamValue(params, "s_centerWidth") = size.width - 2 * bound;
-    ParamValue(params, "s_centerHeight") = size.height - 2 * bound;
-    ParamValue(params, "s_gapWidth") = gap;
-    ParamValue(params, "s_gapHeight") = gap;
+void SetStepParams(const ParamBlock& params) {
+    Twin::Get().SetParam(&params);
 }
 
 void SetStepParams(FrameSize size, ParamChanges changes) {
@@ -105,42 +66,6 @@ void SetStepParams(FrameSize size, ParamChanges changes) {
     for (const auto& [name, value] : changes)
         ParamValue(params, name) = value;
     SetStepParams(params);
-}
-
-ParamBlock RandomSearchParams(SimRandom& random, FrameSize size) {
-    ParamBlock params = host::ParamsForMode(host::Mode::Fp, false);
-    const auto set = [&params](const char* name, int32_t value) {
-        ParamValue(params, name) = value;
-    };
-    const int32_t least = std::min(size.width, size.height);
-    do {
-        const int32_t bound =
-            random.Chance(50) ? random.Range(0, least / 3) : random.Range(0, least / 2);
-        SetTiles(params, size, bound, random.Chance(30) ? 0 : random.Range(0, 20));
-        if (random.Chance(30)) {
-            const int32_t boundHeight = random.Range(0, size.height / 2);
-            set("s_boundHeight", boundHeight);
-            set("s_centerHeight", size.height - 2 * boundHeight);
-            set("s_gapHeight", random.Range(0, random.Chance(10) ? 90 : 20));
-        }
-        if (random.Chance(6))
-            set("s_centerWidth", std::max(size.width - 2 * bound + random.Range(-3, 3), 0));
-        const TemplateSize tplt = RandomTemplate(random, size, bound);
-        set("s_templateWidth", tplt.width);
-        set("s_templateHeight", tplt.height);
-        set("s_multiBloclkFlag", random.Chance(60) ? 1 : 0);
-        set("s_candidateNum", random.Chance(30) ? random.Range(1, 6) : random.Range(1, 200));
-    } while (!CheapSearch(params));
-    set("s_overlapAreaMinFp", RandomThreshold(random, -1, static_cast<int32_t>(size.Pixels())));
-    if (random.Chance(60))
-        set("s_overlapAreaMinFp", random.Range(-1, 40));
-    set("s_diffThresholdStr", RandomThreshold(random, 0, 60));
-    set("s_singleMoveThreshold", RandomThreshold(random, 0, 6));
-    set("s_dimensionlessFlag", random.Chance(30) ? 1 : 0);
-    set("s_sensorWidth", RandomThreshold(random, 1, 200));
-    set("s_downSampleFlag", random.Chance(20) ? 1 : 0);
-    set("s_logShowFlag", 0);
-    return params;
 }
 
 FrameSize SizeOf(const ParamBlock& params) {
@@ -161,6 +86,20 @@ void LoadPair(const PairBytes& pair) {
     LoadFrame(&fpnavi::s_imagePrev, &reference::s_imagePrev, pair.prevGreys, pair.prevTypes);
     LoadFrame(&fpnavi::s_imageCurr, &reference::s_imageCurr, pair.currGreys, pair.currTypes);
     MeasurePair();
+}
+
+bool LoadMatchPair(const ParamBlock& params, const PairBytes& pair) {
+    SetStepParams(params);
+    LoadPair(pair);
+    if (ParamValue(params, "s_multiBloclkFlag") != 1)
+        return true;
+    const bool built = fpnavi::GetFullImg(&fpnavi::s_imagePrev, &fpnavi::s_fullImagePrev) == 0 &&
+                       fpnavi::GetFullImg(&fpnavi::s_imageCurr, &fpnavi::s_fullImageCurr) == 0;
+    const bool builtPlain =
+        reference::GetFullImg(&reference::s_imagePrev, &reference::s_fullImagePrev) == 0 &&
+        reference::GetFullImg(&reference::s_imageCurr, &reference::s_fullImageCurr) == 0;
+    EXPECT_EQ(built, builtPlain);
+    return built;
 }
 
 void LoadPreProcessed(const PairBytes& pair) {
@@ -216,6 +155,13 @@ int32_t NoMove(TwinFrame* prev, TwinFrame* curr) {
     return module;
 }
 
+int32_t NoMoveOfPair() {
+    const int32_t module = fpnavi::FingerNoMove(&fpnavi::s_imagePrev, &fpnavi::s_imageCurr);
+    EXPECT_EQ(module, ModuleOutcome(reference::FingerNoMove(&reference::s_imagePrev,
+                                                            &reference::s_imageCurr)));
+    return module;
+}
+
 namespace {
 
 template <typename Find>
@@ -243,16 +189,53 @@ Candidates PlainCandidates() {
     return FindWith(reference::FindCandidate);
 }
 
-std::vector<uint32_t> ModuleKeys() {
+int32_t CompareCandidates() {
+    const Candidates module = ModuleCandidates();
+    const Candidates plain = PlainCandidates();
+    EXPECT_EQ(module.result, plain.result);
+    EXPECT_EQ(module.di, plain.di);
+    EXPECT_EQ(module.dj, plain.dj);
+    EXPECT_TRUE(SameState());
+    return module.result;
+}
+
+namespace {
+
+// The placements of the current pair, scored.
+struct ScoredPair {
     const fpnavi::SearchParams params = fpnavi::CurrentSearchParams();
     const fpnavi::FramePair pair = fpnavi::LayOutPair(fpnavi::s_imagePrev, fpnavi::s_imageCurr);
     fpnavi::TemplateSet set;
-    EXPECT_TRUE(fpnavi::CutTemplates(params, pair, &set));
-    std::vector<uint8_t> block(fpnavi::PlanMemory(params, set, nullptr).bytes);
-    const fpnavi::SearchMemory memory = fpnavi::PlanMemory(params, set, block.data());
-    fpnavi::RankCandidates(fpnavi::ScorePlacements(params, set, pair, memory), memory.keys,
-                           params.candidateNum);
-    return {memory.keys, memory.keys + params.candidateNum};
+    std::vector<uint8_t> block;
+    fpnavi::SearchMemory memory;
+    fpnavi::PlacementTables tables;
+
+    ScoredPair() {
+        EXPECT_TRUE(fpnavi::CutTemplates(params, pair, &set));
+        block.resize(fpnavi::PlanMemory(params, set, nullptr).bytes);
+        memory = fpnavi::PlanMemory(params, set, block.data());
+        tables = fpnavi::ScorePlacements(params, set, pair, memory);
+    }
+};
+
+}  // namespace
+
+std::vector<uint32_t> ModuleKeys() {
+    const ScoredPair scored;
+    fpnavi::RankCandidates(scored.tables, scored.memory.keys, scored.params.candidateNum);
+    return {scored.memory.keys, scored.memory.keys + scored.params.candidateNum};
+}
+
+Candidates SelectedCandidates() {
+    const ScoredPair scored;
+    return FindWith([&scored](int32_t* di, int32_t* dj) {
+        fpnavi::SelectCandidates(scored.set, scored.tables, {di, dj, scored.params.candidateNum});
+        return 0;
+    });
+}
+
+int32_t PlacementCount() {
+    return ScoredPair().tables.Count();
 }
 
 std::ostream& operator<<(std::ostream& out, const MatchResult& match) {
@@ -279,6 +262,19 @@ int32_t PlainScore(int32_t di, int32_t dj) {
     const int32_t score = PlainMatch({di}, {dj}).difference;
     reference::s_candidateNum = num;
     return score;
+}
+
+int32_t ModuleScore(int32_t di, int32_t dj, int32_t most) {
+    const fpnavi::FramePair pair = fpnavi::LayOutPair(fpnavi::s_imagePrev, fpnavi::s_imageCurr);
+    fpnavi::ColumnMeetings columns;
+    fpnavi::DisplacementScore score(fpnavi::CurrentSearchParams(), pair, &columns, 1);
+    return score.At({di, dj}, most);
+}
+
+FrameSize ComparedSize() {
+    if (fpnavi::s_multiBloclkFlag == 1)
+        return {fpnavi::s_fullImageWidth, fpnavi::s_fullImageHeight};
+    return {fpnavi::s_imageWidth, fpnavi::s_imageHeight};
 }
 
 JointOutcome CalcJoint() {

@@ -13,6 +13,7 @@
 
 #include "ParamTable.h"
 #include "StepFrames.h"
+#include "StepSearchParams.h"
 #include "matching/Templates.h"
 
 namespace fpnavi_test {
@@ -22,13 +23,6 @@ using ParamChanges = std::initializer_list<std::pair<std::string_view, int32_t>>
 // Both sides take the defaults of the fp mode with changes; the image is one block of size.
 void SetStepParams(FrameSize size, ParamChanges changes = {});
 void SetStepParams(const host::ParamBlock& params);
-
-// Tiles, gaps, templates and thresholds of the candidate search and the match for an image of size:
-// fitting ones for the most part, and cheap enough for the plain model.
-host::ParamBlock RandomSearchParams(host::SimRandom& random, FrameSize size);
-
-// Tiles of the whole image: borders of bound, gaps of gap, the centre between them.
-void SetTiles(host::ParamBlock& params, FrameSize size, int32_t bound, int32_t gap);
 
 FrameSize SizeOf(const host::ParamBlock& params);
 
@@ -42,6 +36,13 @@ struct PairBytes {
 PairBytes RandomPair(host::SimRandom& random, FrameSize size);
 void LoadPair(const PairBytes& pair);
 
+// The same under params, with full images where these ask for them. Returns false when the full
+// images cannot be built.
+bool LoadMatchPair(const host::ParamBlock& params, const PairBytes& pair);
+
+// What the module's frames have behind their pixels when they are loaded: value, see FillRoom.
+void SetRoomJunk(int32_t value);
+
 // The frames of the gesture are loaded, pre-processed (class maps are ignored) and measured.
 void LoadPreProcessed(const PairBytes& pair);
 
@@ -50,6 +51,9 @@ void LoadPreProcessed(const PairBytes& pair);
 
 // FingerNoMove of both sides, which must agree, in the module's numbers.
 int32_t NoMove(TwinFrame* prev, TwinFrame* curr);
+
+// The same of the current pair.
+int32_t NoMoveOfPair();
 
 struct Candidates {
     int32_t result = 0;
@@ -63,8 +67,19 @@ struct Candidates {
 Candidates ModuleCandidates();
 Candidates PlainCandidates();
 
+// FindCandidate of both sides, which must agree: result, arrays in their order, and frames. Returns
+// the result.
+int32_t CompareCandidates();
+
 // The module's candidates of the current pair as keys, in the order of its heap.
 std::vector<uint32_t> ModuleKeys();
+
+// The candidates of the current pair as the match of both steps takes them: the best first, the
+// others in no order.
+Candidates SelectedCandidates();
+
+// Placements of all valid templates of the current pair.
+int32_t PlacementCount();
 
 struct MatchResult {
     int32_t dx;
@@ -80,6 +95,12 @@ MatchResult ModuleMatch(const std::vector<int32_t>& di, const std::vector<int32_
 MatchResult PlainMatch(const std::vector<int32_t>& di, const std::vector<int32_t>& dj);
 // What the plain model scores for this displacement alone.
 int32_t PlainScore(int32_t di, int32_t dj);
+
+// What the module scores for it, exact up to most.
+int32_t ModuleScore(int32_t di, int32_t dj, int32_t most = 256);
+
+// The sides of the frames that are compared: full images where there are any.
+FrameSize ComparedSize();
 
 // CalcImgJoint of both, and what the module left at the record's first entry.
 struct JointOutcome {

@@ -1,4 +1,4 @@
-// What the fast threshold search could get wrong, each case made for one of these mistakes. The
+// What the threshold search could get wrong, each case made for one of these mistakes. The
 // expected numbers are worked out beside them.
 #include <gtest/gtest.h>
 
@@ -8,7 +8,6 @@
 #include <utility>
 
 #include "StepFrames.h"
-#include "base/BitRows.h"
 #include "frame/PreProcess.h"
 
 namespace fpnavi_test {
@@ -126,9 +125,9 @@ TEST(StepCalcBiThrTrap, LargeFramesOfNoiseWrapAlike) {
     }
 }
 
-// 64 pixels fill a word, 65 take two.
-TEST(StepGetFingerRidgeTrap, SidesOf64And65SpanFromTheFirstPixelToTheLast) {
-    for (const FrameSize size : {FrameSize{64, 64}, FrameSize{65, 64}, FrameSize{64, 65}}) {
+// The first bit of a row, the last bit of it, and the last row.
+TEST(StepGetFingerRidgeTrap, EdgesSpanFromTheFirstPixelToTheLast) {
+    for (const FrameSize size : EdgeSizes()) {
         std::vector<uint8_t> greys = FlatBytes(size, 9);
         greys.front() = 3;
         greys.back() = 3;
@@ -141,6 +140,23 @@ TEST(StepGetFingerRidgeTrap, SidesOf64And65SpanFromTheFirstPixelToTheLast) {
         const uint8_t* const type = twin.Module()->pType;
         EXPECT_EQ(std::count(type, type + size.width, 1), size.width);
         EXPECT_EQ(std::count(type, type + size.Pixels(), 1), size.width + size.height - 1);
+    }
+}
+
+// Two pixels at any two places of a row, words apart: all between them is finger, nothing else is.
+TEST(StepGetFingerRidgeTrap, EveryRunOfARowIsFilled) {
+    constexpr FrameSize kSize = {193, 1};
+    for (int32_t first = 0; first < kSize.width; ++first) {
+        for (int32_t last = first; last < kSize.width; ++last) {
+            std::vector<uint8_t> greys = FlatBytes(kSize, 200);
+            greys[static_cast<size_t>(first)] = greys[static_cast<size_t>(last)] = 7;
+            TwinFrame twin(kSize, greys, FlatBytes(kSize, 1));
+            fpnavi::GetFingerRidge(twin.Module(), 7);
+            std::vector<uint8_t> expected = FlatBytes(kSize, 0);
+            std::fill(expected.begin() + first, expected.begin() + last + 1, uint8_t{1});
+            ASSERT_TRUE(std::equal(expected.begin(), expected.end(), twin.Module()->pType))
+                << first << " to " << last;
+        }
     }
 }
 

@@ -7,19 +7,21 @@ import resource
 import subprocess
 from dataclasses import dataclass, field, replace
 
-from tree import Failure, run
+from tree import PLAIN, Failure, run
 
 # Files of the module whose tests are in the test file of another.
 _TESTED_IN = {
     'BiThreshold': 'PreProcess', 'FingerRidge': 'PreProcess', 'StretchRange': 'PreProcess',
-    'GreyHistogram': 'PreProcess', 'ShiftTest': 'FingerNoMove', 'Templates': 'FindCandidate',
-    'PlacementDiffs': 'FindCandidate', 'TileMatch': 'ImgJoint', 'JointSearch': 'ImgJoint',
-    'SetNaviParam': 'NaviParam', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
+    'FramePair': 'FingerNoMove', 'Templates': 'FindCandidate', 'TemplatePieces': 'FindCandidate',
+    'PlacementScores': 'FindCandidate', 'CandidateHeap': 'FindCandidate',
+    'CandidateSearch': 'FindCandidate', 'DisplacementScore': 'ImgJoint', 'MatchSearch': 'ImgJoint',
+    'PairMatch': 'ImgJoint', 'TuneMeasure': 'Tune', 'TuneRegisters': 'Tune',
+    'WordLanes': 'FingerDetect', 'SetNaviParam': 'NaviParam', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
     'NaviVoteInfo': 'Gesture', 'NaviMode': 'NaviParam',
 }
 # Files that the step tests do not call.
-_NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneHistogram', 'TuneStep',
-             'NaviBlock', 'alog_host'}
+_NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneHistogram',
+             'TuneMeasure', 'TuneRegisters', 'NaviBlock', 'alog_host'}
 _COMPARED = {'FPNAVI_COMPARE_GESTURES': '200', 'FPNAVI_HOSTILE_BLOCKS': '60'}
 _MEMORY = 1 << 30  # bytes a test may take; the largest takes a tenth
 _OUTPUT = 1 << 24  # bytes it may print
@@ -103,7 +105,8 @@ class Plan:
         alone = re.findall(r'^\[  SKIPPED \] (\S+) \(', _timed(tree, work, unit), re.MULTILINE)
         wanted = [
             Stage('own unit tests', 'unit_tests', seconds=unit.seconds),
-            Stage('texture unit tests', 'finger_detect_tests'), unit,
+            Stage('texture unit tests', 'finger_detect_tests'),
+            Stage('texture plain lanes', 'finger_detect_tests_plain_lanes'), unit,
             *(Stage('unit tests alone', 'unit_tests', name) for name in alone),
             Stage('step by step', 'step_tests', env=_COMPARED),
             Stage('plain lanes', 'step_tests_plain_lanes', env=_COMPARED),
@@ -121,13 +124,13 @@ class Plan:
 
     def for_file(self, file):
         """The stages that look at a mutant of file, in their order."""
+        stages = [s for s in self.stages
+                  if file.endswith(PLAIN) or not s.target.endswith('_plain_lanes')]
         if 'FingerDetect' in file:
-            return [s for s in self.stages if s.target in ('finger_detect_tests', 'golden_tests')]
+            return [s for s in stages if s.target.startswith(('finger_detect', 'golden'))]
         stem = pathlib.Path(file).stem
         own = _suites(self._tree, stem)
-        stages = [s for s in self.stages if s.target != 'finger_detect_tests']
-        if not file.endswith('NaviSimd.h'):
-            stages = [s for s in stages if s.target != 'step_tests_plain_lanes']
+        stages = [s for s in stages if not s.target.startswith('finger_detect')]
         if stem in _NO_STEPS:
             stages = [s for s in stages if s.target != 'step_tests']
         return [replace(s, filter=own) if s.name == 'own unit tests' else s for s in stages

@@ -14,8 +14,10 @@ import shutil
 import subprocess
 
 MUTATED = ('fpsvc/callib/FpNavi', 'fpsvc/callib/FingerDetect', 'devhal/alog')
-TARGETS = ('unit_tests', 'finger_detect_tests', 'step_tests', 'step_tests_plain_lanes',
-           'compare_tests', 'reliability_tests', 'golden_tests')
+TARGETS = ('unit_tests', 'finger_detect_tests', 'finger_detect_tests_plain_lanes', 'step_tests',
+           'step_tests_plain_lanes', 'compare_tests', 'reliability_tests', 'golden_tests')
+PLAIN = ('NaviSimd.h', 'WordLanes.h')  # have plain loops for other processors
+_PLAIN_OBJECTS = ('fpnavi_module_plain_lanes.dir', 'fpnavi_finger_detect_plain_lanes.dir')
 SANITIZE = ('-fsanitize=address,undefined', '-fno-sanitize-recover=all')
 _LEFT_OUT = {'build', 'web', 'docs', 'demo', '.git', 'node_modules', '__pycache__'}
 
@@ -120,7 +122,7 @@ class Tree:
         The module's come first, so that their inline functions are the ones that count, and that
         they are taken instead of an archive's; those of the tests keep their order."""
         linked = {n: str(f) for n, f in changed.items() if self._links(target, n)}
-        first = {n for n in linked if not n.startswith('tests/unit/')}
+        first = {n for n in linked if '/unit_tests.dir/' not in n}
         command = [linked.get(a, a) for a in self.link[target] if a not in first]
         at = command.index('-o')
         command[at:at + 2] = [*flags, *(linked[n] for n in sorted(first)), '-o', str(program)]
@@ -142,13 +144,13 @@ class Tree:
         return sorted(str(path.relative_to(self.copy)) for folder in MUTATED
                       for path in (self.copy / folder).rglob('*') if path.suffix in ('.h', '.cpp'))
 
-    def objects_with(self, file, plain_lanes):
+    def objects_with(self, file):
         """Objects that a change of file may change: the module's, and of the tests of that name.
 
         Tests take the inline functions of a header into their own objects."""
-        stem = pathlib.Path(file).stem
+        stem, plain_lanes = pathlib.Path(file).stem, file.endswith(PLAIN)
         for name, files in self.depends.items():
             test = f'unit_tests.dir/{stem}Test.cpp.o' in name and file.endswith('.h')
-            plain = plain_lanes and 'fpnavi_module_plain_lanes.dir' in name
+            plain = plain_lanes and any(folder in name for folder in _PLAIN_OBJECTS)
             if file in files and (test or plain or self.in_module(name)):
                 yield name

@@ -37,9 +37,8 @@ class Worker(threading.Thread):
 
     def judge(self, mutant):
         """Returns (verdict, stage that killed it, why)."""
-        plain = mutant.file.endswith('NaviSimd.h')
         try:
-            changed = self._compile(mutant, self.tree.objects_with(mutant.file, plain))
+            changed = self._compile(mutant, self.tree.objects_with(mutant.file))
             if not changed:
                 return SAME, '', ''
             return self._test(mutant, self.plan.for_file(mutant.file), changed)

@@ -205,4 +205,22 @@ TEST_F(FingerNoMoveTest, AnyBoundSizeStaysInsideTheFrame) {
     }
 }
 
+// 255 * 8421504 = 2^31 - 128 is the largest sum of black against white that 32 bits hold. With one
+// pixel more it wraps to a negative one, whose mean is below every tolerance.
+TEST_F(FingerNoMoveTest, SumAbove31BitsWrapsToRest) {
+    Params()
+        .Set("s_boundWidth", 0)
+        .Set("s_boundHeight", 0)
+        .Set("s_smallMoveTolRow", 0)
+        .Set("s_smallMoveTolCol", 0)
+        .Set("s_diffThresholdTol", 0)
+        .Apply();
+    TestFrame prev(4096, 2057, 0, 1);
+    TestFrame curr(4096, 2057, 255);
+    curr.Mark(0, 0, 2056, 4096).Mark(2056, 0, 1, 128);  // 8421376 + 128 pixels
+    EXPECT_EQ(fpnavi::FingerNoMove(prev.Get(), curr.Get()), kNoMoveMoved);
+    curr.Type(2056, 128) = 1;
+    EXPECT_EQ(fpnavi::FingerNoMove(prev.Get(), curr.Get()), kNoMoveResting);
+}
+
 }  // namespace

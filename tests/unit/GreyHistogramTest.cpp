@@ -1,10 +1,13 @@
-// Counting four blocks by grey level, and the levels at which counts exceed their limits.
+// Counting bytes and four blocks by grey level, and the levels at which counts exceed their limits.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <array>
 #include <cstdint>
+#include <iterator>
 #include <memory>
 #include <random>
+#include <vector>
 
 #include "base/GreyHistogram.h"
 
@@ -13,6 +16,49 @@ namespace {
 using namespace fpnavi;
 
 using Histogram = std::array<int32_t, kGreyLevels>;
+
+Histogram PlainCounts(const std::vector<uint8_t>& values) {
+    Histogram hist{};
+    for (const uint8_t value : values)
+        ++hist[value];
+    return hist;
+}
+
+// Runs of one value and random ones, of every count up to 40.
+TEST(CountBytes, EveryCountOfValues) {
+    std::mt19937 random(33);
+    for (size_t count = 0; count <= 40; ++count) {
+        for (const uint32_t levels : {1U, 2U, 256U}) {
+            std::vector<uint8_t> values(count);
+            for (uint8_t& value : values)
+                value = static_cast<uint8_t>(255 - random() % levels);
+            const Histogram expected = PlainCounts(values);
+            int32_t hist[kGreyLevels];
+            std::fill(std::begin(hist), std::end(hist), -7);
+            CountBytes(values.data(), static_cast<int32_t>(count), hist);
+            for (size_t level = 0; level < kGreyLevels; ++level)
+                ASSERT_EQ(hist[level], expected[level]) << count << " values, grey " << level;
+        }
+    }
+}
+
+TEST(ByteCounter, CallsAddUpWhereverTheyAreCut) {
+    std::mt19937 random(34);
+    std::vector<uint8_t> values(300);
+    for (uint8_t& value : values)
+        value = static_cast<uint8_t>(random() % 5 * 60);
+    const Histogram expected = PlainCounts(values);
+    for (int32_t round = 0; round < 200; ++round) {
+        ByteCounter counter;
+        for (size_t at = 0; at < values.size();) {
+            const size_t count = std::min<size_t>(random() % 12, values.size() - at);
+            counter.Add(values.data() + at, static_cast<int32_t>(count));
+            at += count;
+        }
+        for (size_t level = 0; level < kGreyLevels; ++level)
+            ASSERT_EQ(counter.Of(static_cast<int32_t>(level)), expected[level]) << "grey " << level;
+    }
+}
 
 TEST(CountFourBlocks, EachBlockHasItsOwnTable) {
     std::mt19937 random(31);

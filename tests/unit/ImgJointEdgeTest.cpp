@@ -1,5 +1,9 @@
-// The smallest displacements that template matching can tell, and their keys.
+// The smallest displacements that template matching can tell, and their keys; frames and tiles that
+// it refuses.
 #include <gtest/gtest.h>
+
+#include <algorithm>
+#include <vector>
 
 #include "Fixtures.h"
 #include "frame/NaviFrame.h"
@@ -62,6 +66,80 @@ TEST_F(ImgJointEdge, PlacementsOfTheGreatestDifferenceThatIsKeptAreCandidates) {
     EXPECT_EQ(record->dy_fp[0], 0);
     EXPECT_EQ(record->diff[0], 254);
     EXPECT_EQ(record->vkey_fp[0], VKEY_NONE);
+}
+
+class ImgJointFrames : public NaviTest {
+  protected:
+    void SetUp() override {
+        NaviTest::SetUp();
+        Params().Set("s_multiBloclkFlag", 0).Set("s_candidateNum", 1).Apply();
+    }
+    // The match and its verification refuse the pair, and write nothing.
+    static void ExpectRefused() {
+        int32_t found[3] = {-99, -99, -99};
+        const int32_t zero = 0;
+        EXPECT_EQ(FindMatch(&zero, &zero, &found[0], &found[1], &found[2]), -1);
+        for (const int32_t value : found)
+            EXPECT_EQ(value, -99);
+        NaviVoteInfo_t* const record = PrintNaviLog();
+        record->diff[0] = 99;
+        EXPECT_EQ(CalcImgJoint(), -1);
+        EXPECT_EQ(record->diff[0], 99);
+    }
+};
+
+TEST_F(ImgJointFrames, OneFrameAloneIsRefused) {
+    TestFrame frame(56, 36, 10, 1);
+    ASSERT_EQ(ImgCopy(&s_imagePrev, frame.Get()), 0);
+    ExpectRefused();
+    ImgClear(&s_imagePrev);
+    ASSERT_EQ(ImgCopy(&s_imageCurr, frame.Get()), 0);
+    ExpectRefused();
+}
+
+TEST_F(ImgJointFrames, FramesOfDifferentSizesAreRefused) {
+    TestFrame frame(56, 36, 10, 1);
+    ASSERT_EQ(ImgCopy(&s_imagePrev, frame.Get()), 0);
+    TestFrame wider(57, 36, 10, 1);
+    ASSERT_EQ(ImgCopy(&s_imageCurr, wider.Get()), 0);
+    ExpectRefused();
+    TestFrame higher(56, 37, 10, 1);
+    ASSERT_EQ(ImgCopy(&s_imageCurr, higher.Get()), 0);
+    ExpectRefused();
+}
+
+// Equal frames, so that every pixel that is compared gives 0. Each defect leaves the other three
+// conditions of an axis true.
+TEST_F(ImgJointFrames, TilesThatDoNotMakeUpASideMeetNowhere) {
+    struct Tiles {
+        int32_t bound, center, gap, score;
+    };
+    const std::vector<Tiles> wide = {{8, 40, 32, 0},    {0, 56, 0, 0},     {28, 0, 1, 0},
+                                     {-1, 58, 32, 255}, {29, -2, 32, 255}, {8, 40, -1, 255},
+                                     {8, 39, 32, 255},  {8, 41, 0, 255}};
+    const std::vector<Tiles> high = {{8, 20, 16, 0},    {0, 36, 0, 0},     {18, 0, 1, 0},
+                                     {-1, 38, 16, 255}, {19, -2, 16, 255}, {8, 20, -1, 255},
+                                     {8, 19, 16, 255},  {8, 21, 0, 255}};
+    TestFrame frame(56, 36, 10, 1);
+    ASSERT_EQ(ImgCopy(&s_imagePrev, frame.Get()), 0);
+    ASSERT_EQ(ImgCopy(&s_imageCurr, frame.Get()), 0);
+    for (const Tiles& w : wide) {
+        for (const Tiles& h : high) {
+            Params params;
+            params.Set("s_candidateNum", 1).Set("s_overlapAreaMinFp", 0);
+            params.Set("s_boundWidth", w.bound).Set("s_centerWidth", w.center);
+            params.Set("s_boundHeight", h.bound).Set("s_centerHeight", h.center);
+            params.Set("s_gapWidth", w.gap).Set("s_gapHeight", h.gap).Apply();
+            const int32_t zero = 0;
+            int32_t dx = -99;
+            int32_t dy = -99;
+            int32_t score = -99;
+            EXPECT_EQ(FindMatch(&zero, &zero, &dx, &dy, &score), 0);
+            EXPECT_EQ(score, std::max(w.score, h.score))
+                << w.bound << ", " << w.center << ", " << w.gap << " and " << h.bound << ", "
+                << h.center << ", " << h.gap;
+        }
+    }
 }
 
 }  // namespace

@@ -18,12 +18,11 @@ class ByteCounter {
   public:
     // Counts the count bytes at values [in]; less than 2^31 bytes in all calls.
     void Add(const uint8_t* values, int32_t count) {
+        constexpr int32_t kUnrolled = 8;
         int32_t i = 0;
-        for (; i + 4 <= count; i += 4) {
-            ++m_turns[0][values[i]];
-            ++m_turns[1][values[i + 1]];
-            ++m_turns[2][values[i + 2]];
-            ++m_turns[3][values[i + 3]];
+        for (; i + kUnrolled <= count; i += kUnrolled) {
+            for (int32_t n = 0; n < kUnrolled; ++n)
+                ++m_turns[n & 3][values[i + n]];
         }
         for (; i < count; ++i)
             ++m_turns[i & 3][values[i]];

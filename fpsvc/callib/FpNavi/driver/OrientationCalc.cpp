@@ -82,19 +82,14 @@ int32_t CompareFingerprints(int32_t n) {
     if (!AreComparable(&s_imagePrev, &s_imageCurr))
         return -1;
     const FramePair pair = LayOutPair(s_imagePrev, s_imageCurr);
-    switch (TestNoMove(pair.prev, pair.curr, CurrentNoMoveLimits())) {
-        case kNoMoveResting:
-            RecordFingerprint(n, VKEY_NO_MOVE);
-            RecordRest(n);
-            return 0;
-        case kNoMoveUndetermined:
-            RecordFingerprint(n, VKEY_NONE);
-            return 0;
-        case kNoMoveMoved:
-            return CoversLess(s_coverageMinFp) ? 0 : MatchPair(pair);
-        default:
-            return -1;
-    }
+    const int32_t outcome = TestNoMove(pair.prev, pair.curr, CurrentNoMoveLimits());
+    if (outcome == kNoMoveMoved)
+        return CoversLess(s_coverageMinFp) ? 0 : MatchPair(pair);
+    const bool resting = outcome == kNoMoveResting;
+    RecordFingerprint(n, resting ? VKEY_NO_MOVE : VKEY_NONE);
+    if (resting)
+        RecordRest(n);
+    return 0;
 }
 
 }  // namespace

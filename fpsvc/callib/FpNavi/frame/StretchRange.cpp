@@ -95,22 +95,6 @@ void StretchPixels(const GreySpan& span, uint32_t scale, NaviFrame_t* img) {
 
 }  // namespace
 
-int64_t SumBytes(const uint8_t* values, int32_t count) {
-    constexpr int32_t kRun = 1 << 20;  // 255 * 2^20 < 2^31
-    int64_t sum = 0;
-    int32_t i = 0;
-    while (count - i >= kLanes) {
-        const int32_t end = i + std::min(count - i, kRun) / kLanes * kLanes;
-        Sums sums = NoSums();
-        for (; i < end; i += kLanes)
-            sums = AddBytes(sums, Load16(values + i));
-        sum += Total(sums);
-    }
-    for (; i < count; ++i)
-        sum += values[i];
-    return sum;
-}
-
 void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t cutOff, int32_t (&hist)[kGreyLevels]) {
     const int32_t cnt = img->width * img->height - TakeOutBackground(*img, hist);
     const GreySpan span = CutPercentiles(hist, cnt, cutOff);

@@ -28,7 +28,7 @@ struct NoMoveLimits {
 NoMoveLimits CurrentNoMoveLimits();
 
 // Compares the frames, which have pixels and are of one size, at every shift within the limits.
-// Returns one of the outcomes above.
+// Returns one of the outcomes above, but kNoMoveFailed.
 int32_t TestNoMove(const LaidFrame& prev, const LaidFrame& curr, const NoMoveLimits& limits);
 
 // Compares the frames at every shift within s_smallMoveTolRow and s_smallMoveTolCol. Returns one
