@@ -1,4 +1,14 @@
 // CalcBiThr: the threshold between ridge and valley with the largest variance between the classes.
+//
+// Requirement: of the thresholds 1..254, the first with the largest variance between the class of
+// greys below it and the class from it up to 254, by truncated means and in wrapping 32-bit
+// arithmetic; and the distance of the two means at that threshold.
+//
+// Observation: from one threshold to the next the pixels of one grey level change class. Both means
+// only rise, mostly by 0 or 1; an empty level changes nothing.
+//
+// Algorithm: one pass over the histogram with running counts and sums. A mean is increased by
+// comparison, and divided anew only when it rises by more than 1.
 #include <cstdint>
 #include <cstdlib>
 
@@ -12,21 +22,22 @@ namespace {
 
 constexpr int32_t kGreyLast = 254;  // 255 is saturation and belongs to neither class
 
-// The counter of a grey level has 8 bits and wraps: of a level that fills the frame only the
-// remainder counts, which keeps flat ground from outweighing the ridges.
+// Deliberate: the counter of a grey level has 8 bits and wraps, so that a level that fills the
+// frame does not outweigh the ridges.
 uint32_t WrappedCount(int32_t count) {
     return static_cast<uint32_t>(count) & 0xFFU;
 }
 
-// One class: pixels of consecutive grey levels. At most 255 levels of at most 255 pixels: the sum
-// stays below 255 * 255 * 255 < 2^24, and so does (mean + 1) * count.
+// One class: pixels of consecutive grey levels. At most 255 levels of at most 255 pixels each:
+// count <= 255 * 255 < 2^16, sum <= 254 * count < 2^24, (mean + 1) * count <= sum + count < 2^24.
 struct GreyClass {
     uint32_t count;
     uint32_t sum;
 };
 
-// The truncated mean of a class that only grows brighter from one threshold to the next: both do.
-// It mostly rises by 1 or not at all, which takes no division.
+// The truncated mean of a class, of which both only rise from one threshold to the next: the lower
+// class gains brighter pixels than it has, the upper one loses its darkest. A rise of 0 or 1 takes
+// no division.
 struct RisingMean {
     // The mean and 1. Of an empty class 1 or 2: the lower class is empty at the first threshold
     // only, and what comes to it is at least 1; the upper class stays empty.
@@ -62,7 +73,7 @@ class Split {
     // mean: of all pixels, also of those that no class has; -256..255.
     Split(const GreyClass& all, int32_t mean) : m_all(all), m_nextToMean(mean + 1) {}
 
-    // Tries the threshold t, to which added pixels of level t - 1 come.
+    // Tries threshold t: the added pixels of level t - 1 join the lower class.
     void Try(int32_t t, uint32_t added) {
         m_lower.count += added;
         m_lower.sum += static_cast<uint32_t>(t - 1) * added;

@@ -24,8 +24,8 @@ void MarkDarkPixels(NaviFrame_t* img) {
 
 }  // namespace
 
-// The greys are counted once: what the threshold needs is their histogram, what the stretch needs
-// is the same without the pixels outside the finger area.
+// The greys are counted once: the threshold needs their histogram, the stretch the same histogram
+// without the pixels outside the finger area.
 int32_t ImgPreProcess(NaviFrame_t* img) {
     if (IsHg()) {
         MarkDarkPixels(img);

@@ -19,7 +19,7 @@ int32_t ImgPreProcess(NaviFrame_t* img);
 int32_t CalcBiThr(const NaviFrame_t* img, int32_t* thr, int32_t* scale);
 
 // Builds the finger area in pType: the pixels of grey <= thr and all between two of them in a row
-// or a column, twice over. img has pixels, and room behind them (FrameBytes).
+// or a column, twice over. img has pixels, and space behind them (FrameBytes).
 void GetFingerRidge(NaviFrame_t* img, int32_t thr);
 
 // Stretches the greys of the finger area so that its s_cutOffPercent percentile becomes 0 and the
@@ -35,8 +35,11 @@ struct BiThreshold {
 // CalcBiThr of size pixels that are counted in hist.
 BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size);
 
-// StretchRange of a frame with pixels. hist [in, out]: all greys of img, counted; those of the
-// finger area afterwards. cutOff: percent.
+// StretchRange of a frame with pixels.
+//   img [in, out]   greys of the finger area are stretched
+//   scale           grey level of the upper percentile
+//   cutOff          the percentile, percent of the finger's pixels
+//   hist [in, out]  all greys of img, counted; those of the finger area afterwards
 void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t cutOff, int32_t (&hist)[kGreyLevels]);
 
 }  // namespace fpnavi
