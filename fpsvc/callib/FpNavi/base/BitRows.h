@@ -22,10 +22,15 @@ inline uint64_t FirstBits(int32_t count) {
     return count >= kWordPixels ? ~uint64_t{0} : (uint64_t{1} << count) - 1;
 }
 
+// All bits from first on; 0 <= first < 64. Shifted twice, so that no set bit is shifted out.
+inline uint64_t BitsFrom(int32_t first) {
+    return ~uint64_t{0} >> first << first;
+}
+
 // The bits from first up to but without last; 0 <= first < last, first < 64.
 inline uint64_t BitsBetween(int32_t first, int32_t last) {
     const uint64_t all = ~uint64_t{0};
-    return all << first & (last < kWordPixels ? all >> (kWordPixels - last) : all);
+    return BitsFrom(first) & (last < kWordPixels ? all >> (kWordPixels - last) : all);
 }
 
 // Bit c is set where row[c] <= value. row [in]: width bytes, 1 <= width <= 64, of which up to 15

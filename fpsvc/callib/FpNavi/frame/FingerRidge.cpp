@@ -47,7 +47,7 @@ void FillRow(uint64_t* row, int32_t words) {
     int32_t last = words - 1;
     while (row[last] == 0)
         --last;
-    const uint64_t head = ~uint64_t{0} << __builtin_ctzll(row[first]);
+    const uint64_t head = BitsFrom(__builtin_ctzll(row[first]));
     const uint64_t tail = ~uint64_t{0} >> __builtin_clzll(row[last]);
     if (first == last) {
         row[first] = head & tail;

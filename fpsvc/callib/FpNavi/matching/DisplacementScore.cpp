@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "param/NaviLimits.h"
+
 namespace fpnavi {
 namespace {
 
@@ -9,13 +11,17 @@ namespace {
 TileAxis CutAxis(int32_t side, int32_t bound, int32_t center, int32_t gap, bool tiled) {
     if (!tiled)
         return {{{0, side}, {0, 0}, {0, 0}}, 1, 0, side};
-    const bool fits = bound >= 0 && center >= 0 && gap >= 0 && side - bound - bound == center;
+    const int64_t fullSide = side + 2 * int64_t{gap};
+    const bool fits = bound >= 0 && center >= 0 && gap >= 0 && fullSide <= kSideMax &&
+                      side - 2 * int64_t{bound} == center;
     if (!fits)
         return {{}, 0, 0, 0};
     if (gap == 0)
         return {{{0, side}, {0, 0}, {0, 0}}, 1, 0, side};
-    return {
-        {{0, bound}, {bound, side - bound}, {side - bound, side}}, kBandMax, gap, side + 2 * gap};
+    return {{{0, bound}, {bound, side - bound}, {side - bound, side}},
+            kBandMax,
+            gap,
+            static_cast<int32_t>(fullSide)};
 }
 
 Meeting MeetStep(const TileAxis& axis, int32_t displacement, int32_t step) {

@@ -14,7 +14,6 @@
 namespace fpnavi {
 namespace {
 
-constexpr int32_t kSideMax = 4096;                  // pixels
 constexpr int32_t kCandidateMax = 65536;            // entries
 constexpr int64_t kPairWorkMax = int64_t{1} << 28;  // byte comparisons
 constexpr int64_t kFactorMax = int64_t{1} << 31;    // bounds products by 2^62
