@@ -141,4 +141,23 @@ TEST(ScorePlacements, TemplatesOutsideTheFingerAreNotPlaced) {
         EXPECT_EQ(table.rows, 0);
 }
 
+// 4096 x 4095 pixels, of which one lacks a grey level for a mean of 255: the remainder is as large
+// as it gets, and so is what the reciprocal is rounded up by.
+TEST(ScorePlacements, LargestTemplateIsDividedExactly) {
+    SearchParams params = ParamsOf(4096, 4095, 0, 4096, 4095, false);
+    params.tpltNum = 1;
+    TestFrame cut(4096, 4095, 255, 1);
+    TestFrame searched(4096, 4095, 0, 1);
+    const FramePair pair = {LayOut(*searched.Get()), LayOut(*cut.Get()), false};
+    TemplateSet set;
+    ASSERT_TRUE(CutTemplates(params, pair, &set));
+    std::vector<uint8_t> block(PlanMemory(params, set, nullptr).bytes);
+    const SearchMemory memory = PlanMemory(params, set, block.data());
+    const PlacementTables tables = ScorePlacements(params, set, pair, memory);
+    ASSERT_EQ(tables.Count(), 1);
+    EXPECT_EQ(tables.of[0].diff[0], 255);
+    searched.Grey(4094, 4095) = 1;
+    EXPECT_EQ(ScorePlacements(params, set, pair, memory).of[0].diff[0], 254);
+}
+
 }  // namespace
