@@ -115,7 +115,11 @@ class Plan:
             Stage('failing allocations', 'reliability_tests', '-BoundaryValues.*', _COMPARED),
             Stage('sanitized unit tests', 'unit_tests', sanitized=True),
             Stage('sanitized texture unit tests', 'finger_detect_tests', sanitized=True),
+            Stage('sanitized texture plain lanes', 'finger_detect_tests_plain_lanes',
+                  sanitized=True),
             Stage('sanitized steps', 'step_tests', env=_COMPARED, sanitized=True),
+            Stage('sanitized plain lanes', 'step_tests_plain_lanes', env=_COMPARED,
+                  sanitized=True),
         ]
         self.stages = [stage for stage in wanted if only in stage.name]
         for stage in self.stages:

@@ -68,7 +68,7 @@ class Tree:
     def _sanitize(self, jobs):
         """The module's objects once more, with the sanitizers: below build/sanitized."""
         with concurrent.futures.ThreadPoolExecutor(jobs) as pool:
-            list(pool.map(self._sanitize_one, filter(self.in_module, self.compile)))
+            list(pool.map(self._sanitize_one, filter(self.is_sanitized, self.compile)))
 
     def _sanitize_one(self, name):
         old, new = self.build / name, self.sanitized(name)
@@ -87,6 +87,16 @@ class Tree:
     def in_module(name):
         """The object is one that a device gets."""
         return name.startswith(MUTATED)
+
+    @staticmethod
+    def is_plain(name):
+        """The object is one of the module with the plain loops."""
+        return any(folder in name for folder in _PLAIN_OBJECTS)
+
+    @classmethod
+    def is_sanitized(cls, name):
+        """The object has a twin with the sanitizers."""
+        return cls.in_module(name) or cls.is_plain(name)
 
     def _read_commands(self):
         entries = json.loads((self.build / 'compile_commands.json').read_text())
@@ -130,13 +140,15 @@ class Tree:
 
     def _links(self, target, name):
         """The target's program has the object, by itself or in an archive."""
-        folder = name.partition('/CMakeFiles/')[0]
-        archive = 'host/libfpnavi_host.a' if folder == MUTATED[0] else f'{folder}/lib'
-        return name in self.link[target] or any(a.startswith(archive) for a in self.link[target])
+        folder, _, rest = name.partition('/CMakeFiles/')
+        library = rest.partition('.dir/')[0]
+        archive = 'host/libfpnavi_host.a' if folder == MUTATED[0] else f'{folder}/lib{library}.a'
+        return name in self.link[target] or archive in self.link[target]
 
     def sanitized_link_command(self, target, program, changed):
         """Links program like target, with the module sanitized; changed are objects of it."""
-        module = {n: changed.get(n, self.sanitized(n)) for n in self.compile if self.in_module(n)}
+        twins = filter(self.is_sanitized, self.compile)
+        module = {name: changed.get(name, self.sanitized(name)) for name in twins}
         return self.link_command(target, program, module, SANITIZE)
 
     def sources(self):
@@ -151,6 +163,6 @@ class Tree:
         stem, plain_lanes = pathlib.Path(file).stem, file.endswith(PLAIN)
         for name, files in self.depends.items():
             test = f'unit_tests.dir/{stem}Test.cpp.o' in name and file.endswith('.h')
-            plain = plain_lanes and any(folder in name for folder in _PLAIN_OBJECTS)
+            plain = plain_lanes and self.is_plain(name)
             if file in files and (test or plain or self.in_module(name)):
                 yield name

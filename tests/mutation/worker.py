@@ -50,7 +50,7 @@ class Worker(threading.Thread):
         for stage in stages:
             key = stage.target, stage.sanitized
             if stage.sanitized and sanitized is None:
-                inside = [name for name in changed if self.tree.in_module(name)]
+                inside = [name for name in changed if self.tree.is_sanitized(name)]
                 sanitized = self._compile(mutant, inside, SANITIZE)
             if key not in programs:
                 programs[key] = self.work / f'{stage.target}{"_sanitized" * stage.sanitized}'

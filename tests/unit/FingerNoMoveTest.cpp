@@ -205,6 +205,28 @@ TEST_F(FingerNoMoveTest, AnyBoundSizeStaysInsideTheFrame) {
     }
 }
 
+// Equal frames, of which one common pixel would be enough for rest.
+TEST_F(FingerNoMoveTest, BandsThatDoNotLieInTheFrameCompareNothing) {
+    TestFrame prev(56, 36, 50, 1);
+    TestFrame curr(56, 36, 50, 1);
+    for (const int32_t width : {-1, 0, 8, 56, 57}) {
+        for (const int32_t height : {-1, 0, 8, 36, 37}) {
+            Params()
+                .Set("s_boundWidth", width)
+                .Set("s_boundHeight", height)
+                .Set("s_overlapAreaMinNoMove", 1)
+                .Apply();
+            // Borders of a whole side leave no centre to meet the borders of the other axis.
+            const bool columns = width == 0 || width == 8;
+            const bool rows = height == 0 || height == 8;
+            const bool some = (columns && (rows || height == 36)) || (rows && width == 56);
+            EXPECT_EQ(fpnavi::FingerNoMove(prev.Get(), curr.Get()),
+                      some ? kNoMoveResting : kNoMoveUndetermined)
+                << width << ", " << height;
+        }
+    }
+}
+
 // 255 * 8421504 = 2^31 - 128 is the largest sum of black against white that 32 bits hold. With one
 // pixel more it wraps to a negative one, whose mean is below every tolerance.
 TEST_F(FingerNoMoveTest, SumAbove31BitsWrapsToRest) {

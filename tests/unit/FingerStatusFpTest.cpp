@@ -41,11 +41,12 @@ class FpDetect : public NaviTest {
 };
 
 TEST_F(FpDetect, TextureTestGetsTheFrameItsSizeAndThePresets) {
-    TestFrame frame(56, 36, 240);
-    Detect(frame);
+    const std::vector<uint8_t> greys(2016, 240);
+    m_params.Apply();
+    NavFingerDetectFp(greys.data());
     ASSERT_EQ(FingerBlkFake::Calls().size(), 1U);
     const FingerBlkCall& call = FingerBlkFake::Calls()[0];
-    EXPECT_EQ(call.image, m_image.data());
+    EXPECT_EQ(call.image, greys.data());
     EXPECT_EQ(call.width, 56);
     EXPECT_EQ(call.height, 36);
     EXPECT_EQ(call.mode, 0);

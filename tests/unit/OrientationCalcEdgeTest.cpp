@@ -1,5 +1,5 @@
 // What a resting pair leaves in an entry of the record that is not empty, and which frame of a pair
-// is measured.
+// is measured; maps of a double scan that is off.
 #include <gtest/gtest.h>
 
 #include <vector>
@@ -7,6 +7,7 @@
 #include "Fixtures.h"
 #include "driver/OrientationCalc.h"
 #include "frame/NaviFrame.h"
+#include "param/NaviParam.h"
 
 namespace {
 
@@ -62,6 +63,26 @@ TEST_F(MeasuredFrames, AnyMeasureOfThePreviousFrameKeepsAllThree) {
     EXPECT_EQ(Recorded(0, -33, 0), (std::vector<int32_t>{0, -33, 0}));
     EXPECT_EQ(Recorded(0, 0, 33), (std::vector<int32_t>{0, 0, 33}));
     EXPECT_EQ(Recorded(1, 1, 1), (std::vector<int32_t>{1, 1, 1}));
+}
+
+TEST_F(DriverEdge, MapsWithoutTheDoubleScanAreNotRecorded) {
+    if (s_doubleScanFlag == 1)
+        GTEST_SKIP() << "the double scan of an earlier test stays on";
+    Params().Set("s_modeFlag", 1).Apply();
+    NaviVoteInfo_t* const record = PrintNaviLog();
+    for (auto* const entries : {&record->xc_ds, &record->yc_ds, &record->cvr_ds})
+        (*entries)[0] = (*entries)[1] = 99;
+    ASSERT_EQ(GetDoubleScanNaviBlock(0xFFFFFFFFU, 0), 0);
+    ASSERT_EQ(GetDoubleScanNaviBlock(0, 0xFFFFFFFFU), 0);
+    const std::vector<uint8_t> frame = RectImage(40, 48, 8, 4, 32, 16);
+    ASSERT_EQ(OrientationCalc(frame.data(), frame.data(), 0), 0);
+    ASSERT_EQ(OrientationCalc(frame.data(), frame.data(), 0), 0);
+    ASSERT_EQ(record->calc_cnt, 1);
+    for (int32_t n = 0; n < 2; ++n) {
+        EXPECT_EQ(record->xc_ds[n], 99) << n;
+        EXPECT_EQ(record->yc_ds[n], 99) << n;
+        EXPECT_EQ(record->cvr_ds[n], 99) << n;
+    }
 }
 
 }  // namespace

@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <random>
 #include <vector>
@@ -9,6 +10,7 @@
 #include "Fixtures.h"
 #include "frame/FramePair.h"
 #include "matching/PlacementScores.h"
+#include "matching/TemplatePieces.h"
 #include "matching/Templates.h"
 
 namespace {
@@ -125,6 +127,48 @@ TEST(ScorePlacements, LargestSumsGive255) {
     }
 }
 
+// Bytes from the start of the block to a part of the memory.
+ptrdiff_t At(const void* part, const std::vector<uint8_t>& block) {
+    return static_cast<const uint8_t*>(part) - block.data();
+}
+
+// The parts follow each other, each in steps of 16 bytes. pieces: of the template that has most.
+void ExpectPlan(const SearchParams& params, uint8_t type, int32_t pieces, int32_t placements) {
+    TestFrame frame(params.imageWidth, params.imageHeight, 9, type);
+    const FramePair pair = {LayOut(*frame.Get()), LayOut(*frame.Get()), false};
+    TemplateSet set;
+    ASSERT_TRUE(CutTemplates(params, pair, &set));
+    std::vector<uint8_t> block(PlanMemory(params, set, nullptr).bytes);
+    const SearchMemory memory = PlanMemory(params, set, block.data());
+    ptrdiff_t at = 0;
+    EXPECT_EQ(At(memory.keys, block), at);
+    at += (4 * params.candidateNum + 15) / 16 * 16;
+    EXPECT_EQ(At(memory.packed, block), at);
+    at += pieces * 4 * 64;  // four templates of one size, 64 bytes a piece
+    EXPECT_EQ(At(memory.strips, block), at);
+    at += kStripsBytes;
+    EXPECT_EQ(At(memory.sums, block), at);
+    at += pieces > 1 ? 4 * 16 * 16 * 4 : 0;  // of four templates at 16 x 16 placements
+    EXPECT_EQ(At(memory.columns, block), at);
+    at += (kColumnSlots * static_cast<ptrdiff_t>(sizeof(ColumnMeetings)) + 15) / 16 * 16;
+    EXPECT_EQ(At(memory.scores, block), at);
+    at += (placements + 16 + 15) / 16 * 16;
+    EXPECT_EQ(static_cast<ptrdiff_t>(block.size()), at);
+}
+
+TEST(PlanMemory, TakesWhatASearchNeeds) {
+    ExpectPlan(ParamsOf(40, 30, 8, 12, 5, true), 0, 0, 0);
+    // 12 x 5 pixels are one piece; 13 * 10 placements of the wide templates, 20 * 3 of the tall.
+    ExpectPlan(ParamsOf(40, 30, 8, 12, 5, true), 1, 1, 4 * (13 * 10 + 20 * 3));
+    // 17 x 5: 16 x 4, 16 x 1 and 1 x 5; 5 x 17: two pieces.
+    ExpectPlan(ParamsOf(24, 19, 0, 17, 5, false), 1, 3, 2 * (8 * 15 + 20 * 3));
+    ExpectPlan(ParamsOf(19, 18, 0, 5, 17, false), 1, 3, 2 * (15 * 2 + 3 * 14));
+    // One template at 17 placements: one more than two steps hold with the 16 bytes behind them.
+    SearchParams params = ParamsOf(28, 5, 0, 12, 5, false);
+    params.tpltNum = 1;
+    ExpectPlan(params, 1, 1, 17);
+}
+
 // Without finger no template is valid, and nothing is planned but the keys.
 TEST(ScorePlacements, TemplatesOutsideTheFingerAreNotPlaced) {
     const SearchParams params = ParamsOf(40, 30, 8, 12, 5, true);
@@ -139,6 +183,25 @@ TEST(ScorePlacements, TemplatesOutsideTheFingerAreNotPlaced) {
     EXPECT_EQ(tables.Count(), 0);
     for (const PlacementTable& table : tables.of)
         EXPECT_EQ(table.rows, 0);
+}
+
+// 4096 x 4095 pixels, of which one lacks a grey level for a mean of 255: the remainder is as large
+// as it gets, and so is what the reciprocal is rounded up by.
+TEST(ScorePlacements, LargestTemplateIsDividedExactly) {
+    SearchParams params = ParamsOf(4096, 4095, 0, 4096, 4095, false);
+    params.tpltNum = 1;
+    TestFrame cut(4096, 4095, 255, 1);
+    TestFrame searched(4096, 4095, 0, 1);
+    const FramePair pair = {LayOut(*searched.Get()), LayOut(*cut.Get()), false};
+    TemplateSet set;
+    ASSERT_TRUE(CutTemplates(params, pair, &set));
+    std::vector<uint8_t> block(PlanMemory(params, set, nullptr).bytes);
+    const SearchMemory memory = PlanMemory(params, set, block.data());
+    const PlacementTables tables = ScorePlacements(params, set, pair, memory);
+    ASSERT_EQ(tables.Count(), 1);
+    EXPECT_EQ(tables.of[0].diff[0], 255);
+    searched.Grey(4094, 4095) = 1;
+    EXPECT_EQ(ScorePlacements(params, set, pair, memory).of[0].diff[0], 254);
 }
 
 }  // namespace

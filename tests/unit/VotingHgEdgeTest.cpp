@@ -1,4 +1,4 @@
-// The hg vote on centroids that no frame has.
+// The hg vote on centroids that no frame has, and on verdicts behind the last pair.
 #include <gtest/gtest.h>
 
 #include "Fixtures.h"
@@ -34,6 +34,18 @@ TEST_F(HgVoteEdge, CrossingWithoutAWayGivesTheNegativeKeyOfTheVerticalAxis) {
     record->yc[0] = 46341;
     record->yc[1] = 46341;
     EXPECT_EQ(Voting_hg_mode(), VKEY_DOWN);
+}
+
+TEST_F(HgVoteEdge, VerdictBehindTheLastPairIsNotCounted) {
+    Params().Set("s_modeFlag", 1).Set("s_totalMoveThreshold", 1).Set("s_moveCntEffThr", 1).Apply();
+    NaviVoteInfo_t* const record = PrintNaviLog();
+    record->calc_cnt = 1;
+    record->xc[1] = 30;
+    record->vkey_ct[0] = VKEY_NO_MOVE;
+    record->vkey_ct[1] = VKEY_RIGHT;
+    EXPECT_EQ(Voting_hg_mode(), VKEY_NO_MOVE);
+    record->vkey_ct[0] = VKEY_RIGHT;
+    EXPECT_EQ(Voting_hg_mode(), VKEY_RIGHT);
 }
 
 }  // namespace
