@@ -58,7 +58,7 @@ void ReplayPictures(uint64_t test, Mode mode, MakeParams makeParams, int64_t per
         SimRandom random(SeedOf(test, i));
         const ParamBlock params = CheapParams(random, mode, makeParams);
         twin.SetParam(&params);
-        if (!twin.ImageFits()) {
+        if (!Twin::ImageFits()) {
             counts.Note("image_too_large");
             continue;
         }
