@@ -1,7 +1,7 @@
-// A gesture frame by frame: what each method found, and which gate or test settled each pair.
+// A gesture frame by frame: what each method found, and which gate or test decided each pair.
 //
 // The module has no hook for this. The trace is read from its state before and after each call;
-// where the record cannot tell, the no-move test, which only reads, is asked once more.
+// where the record cannot tell, the no-move test, which only reads, is run once more.
 #ifndef FPNAVI_HOST_EXPLAIN_H
 #define FPNAVI_HOST_EXPLAIN_H
 
@@ -22,7 +22,7 @@ enum class SettledBy : int32_t {
     NoMoveUndetermined,  // too little common finger area for the no-move test
     TemplateCoverage,    // moved; a frame covers less than s_coverageMinFp
     TemplateMatch,       // moved; the templates were matched
-    RecordFull,          // pair dropped: the record has no room
+    RecordFull,          // pair dropped: the record is full
     Failed,              // a call returned -1
 };
 

@@ -31,7 +31,7 @@ std::vector<std::string> Split(std::string_view text, char separator) {
     return parts;
 }
 
-// One line cut into fields that are asked for by column name.
+// One line cut into fields that are found by column name.
 class CsvLine {
   public:
     CsvLine(const std::string& path, size_t line, const std::vector<std::string>& columns,

@@ -1,4 +1,4 @@
-// Replays a store of gestures, if asked with some parameters changed.
+// Replays a store of gestures, optionally with some parameters changed.
 #ifndef FPNAVI_HOST_REPLAYCORPUS_H
 #define FPNAVI_HOST_REPLAYCORPUS_H
 

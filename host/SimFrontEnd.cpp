@@ -21,7 +21,8 @@ int32_t Byte(uint32_t value, uint32_t index) {
     return static_cast<int32_t>((value >> (8 * index)) & 0xFFU);
 }
 
-// Two bytes whose difference is dc: low and low + dc, low any value that leaves room.
+// Two bytes whose difference is dc: low and low + dc, low any value for which the sum is at most
+// 255.
 uint32_t BytePair(int32_t dc, uint32_t bits) {
     const uint32_t low = (bits & 0xFFU) % static_cast<uint32_t>(256 - dc);
     return ((low + static_cast<uint32_t>(dc)) << 8) | low;

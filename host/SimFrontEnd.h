@@ -1,7 +1,7 @@
 // A simulated analogue front end: what the sensor shows at each value of its DC register. It is
 // what the tuning steers, and answers a little off from what the gain tables promise.
 //
-// Integers only, as the rest of the simulator; equal plans and equal registers give equal frames.
+// Integers only, as in all of the simulator; equal plans and equal registers give equal frames.
 #ifndef FPNAVI_HOST_SIMFRONTEND_H
 #define FPNAVI_HOST_SIMFRONTEND_H
 

@@ -18,8 +18,8 @@ constexpr int32_t kLeastGoodPairs = 4;
 constexpr int32_t kLeastTravel16 = 20 * 16;  // over the good pairs
 constexpr int32_t kLeastBlobTravel16 = 12 * 16;
 constexpr int32_t kLeastCrossing = 25;  // percent of the gradient along the motion
-// Skin that has moved by two pixels still counts as resting; what changes beyond that, as crossing
-// times the rest of the step, percent times 1/16 pixel.
+// Skin that has moved by two pixels still counts as resting. The least change beyond that: crossing
+// in percent times what remains of the step, in 1/16 pixel.
 constexpr int32_t kRestStep16 = 32;
 constexpr int32_t kLeastChange = 2200;
 

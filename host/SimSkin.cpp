@@ -13,7 +13,7 @@ constexpr int32_t kMinutiaCount = 30;            // one in about 46 x 46 pixels
 // Noise layers; each has its own lattice.
 enum NoiseLayer : size_t { kBendX, kBendY, kPhase, kAmplitude, kBlotch, kGrain, kBreak };
 
-// Atan2 of whole-pixel distances, looked up: it is asked 30 times for each cell.
+// Atan2 of whole-pixel distances, from a table: it is needed 30 times for each cell.
 class TurnTable {
   public:
     TurnTable() : m_turns(static_cast<size_t>(kSpan) * kSpan) {

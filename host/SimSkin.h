@@ -1,7 +1,7 @@
 // The skin of one simulated finger: a ridge pattern with a core, minutiae and irregularities.
 //
-// The pattern is a function of the seed and the position alone. It is computed where it is asked
-// for and kept, so that a finger that moves shows the same skin again.
+// The pattern is a function of the seed and the position alone. It is computed where it is needed
+// and kept, so that a finger that moves shows the same skin again.
 #ifndef FPNAVI_HOST_SIMSKIN_H
 #define FPNAVI_HOST_SIMSKIN_H
 

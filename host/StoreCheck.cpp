@@ -1,4 +1,4 @@
-// What makes a gesture fit for a store; asked when it goes in and when it comes out.
+// The rules for a gesture in a store, checked when it is written and when it is read.
 #include <fmt/format.h>
 
 #include "Error.h"

@@ -175,7 +175,7 @@ void UpgradeSchema(Database& database) {
         return;
     constexpr const char* kDoing = "add the checksums";
     Transaction transaction(database, kDoing);
-    // Asked again within the transaction: another process may have done it meanwhile.
+    // Checked again within the transaction: another process may have done it meanwhile.
     if (StoreVersion(database) == kStoreSchemaWithoutChecksums)
         database.Execute(
             fmt::format("ALTER TABLE gesture ADD COLUMN checksum INTEGER; PRAGMA user_version = {}",

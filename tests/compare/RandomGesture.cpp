@@ -4,6 +4,9 @@
 #include <cstdlib>
 #include <iterator>
 #include <limits>
+#include <string>
+
+#include "StepSearchParams.h"
 
 namespace fpnavi_test {
 namespace {
@@ -62,40 +65,99 @@ ParamBlock VariedParams(SimRandom& random, host::Mode mode) {
     return params;
 }
 
+namespace {
+
+// Half of a pair's comparisons that the plain model may take; a frame of 200 x 200 takes 40,000 for
+// one candidate.
+constexpr double kMostCompared = 3e5;
+constexpr int32_t kLargestSide = 200;
+
+FrameSize SensorSize(SimRandom& random) {
+    if (random.Chance(1))
+        return {random.Range(130, kLargestSide), random.Range(130, kLargestSide)};
+    if (random.Chance(30))
+        return {random.Range(1, 24), random.Range(1, 24)};
+    return RandomSize(random);
+}
+
+// A divisor of side.
+int32_t BlockSide(SimRandom& random, int32_t side) {
+    int32_t block = random.Range(1, side);
+    while (side % block != 0)
+        --block;
+    return block;
+}
+
+void SetSensor(SimRandom& random, host::Mode mode, FrameSize size, ParamBlock& params) {
+    const std::string suffix = mode == host::Mode::Hg ? "Hg" : "Fp";
+    const int32_t blockWidth = BlockSide(random, size.width);
+    const int32_t blockHeight = BlockSide(random, size.height);
+    ParamValue(params, "s_blockWidth" + suffix) = blockWidth;
+    ParamValue(params, "s_blockHeight" + suffix) = blockHeight;
+    ParamValue(params, "s_blockColNum" + suffix) = size.width / blockWidth;
+    ParamValue(params, "s_blockRowNum" + suffix) = size.height / blockHeight;
+    ParamValue(params, "s_imageWidthHg") = size.width;
+    ParamValue(params, "s_imageHeightHg") = size.height;
+}
+
+// Tiles and templates of size, without another grid of blocks.
+void SetTilesOfSensor(SimRandom& random, FrameSize size, ParamBlock& params) {
+    ParamBlock drawn = params;
+    DrawSearch(random, size, kMostCompared, drawn);
+    for (const char* const name : {"s_centerWidth", "s_centerHeight", "s_boundWidth",
+                                   "s_boundHeight", "s_gapWidth", "s_gapHeight", "s_templateWidth",
+                                   "s_templateHeight", "s_multiBloclkFlag", "s_candidateNum"})
+        ParamValue(params, name) = ParamValue(drawn, name);
+    if (random.Chance(4))
+        ParamValue(params, "s_boundWidth") = random.Range(-1, size.width + 1);
+    if (random.Chance(4))
+        ParamValue(params, "s_boundHeight") = random.Range(-1, size.height + 1);
+    ParamValue(params, "s_overlapAreaMinFp") = random.Range(-1, 60);
+    ParamValue(params, "s_overlapAreaMinNoMove") = random.Range(-1, 60);
+}
+
+}  // namespace
+
 ParamBlock OtherGeometryParams(SimRandom& random, host::Mode mode) {
     ParamBlock params = VariedParams(random, mode);
-    const char* const suffix = mode == host::Mode::Hg ? "Hg" : "Fp";
-    const auto set = [&params](const std::string& name, int32_t value) {
-        ParamValue(params, name) = value;
-    };
-    const int32_t blockWidth = random.Range(1, 9);
-    const int32_t blockHeight = random.Range(1, 9);
-    const int32_t colNum = random.Range(1, 8);
-    const int32_t rowNum = random.Range(1, 10);
-    set(std::string("s_blockWidth") + suffix, blockWidth);
-    set(std::string("s_blockHeight") + suffix, blockHeight);
-    set(std::string("s_blockColNum") + suffix, colNum);
-    set(std::string("s_blockRowNum") + suffix, rowNum);
-    const int32_t width = blockWidth * colNum;
-    const int32_t height = blockHeight * rowNum;
-    set("s_imageWidthHg", width);
-    set("s_imageHeightHg", height);
-    const int32_t boundWidth = random.Range(0, width / 2);
-    const int32_t boundHeight =
-        random.Chance(50) ? std::min(boundWidth, height / 2) : random.Range(0, height / 2);
-    set("s_boundWidth", boundWidth);
-    set("s_boundHeight", boundHeight);
-    const int32_t mismatch = random.Chance(12) ? random.Range(-3, 3) : 0;
-    set("s_centerWidth", width - 2 * boundWidth + mismatch);
-    set("s_centerHeight", height - 2 * boundHeight);
-    set("s_gapWidth", random.Range(0, 20));
-    set("s_gapHeight", random.Range(0, 20));
-    set("s_templateWidth", random.Range(1, 12));
-    set("s_templateHeight", random.Range(1, 8));
-    set("s_candidateNum", random.Range(1, 60));
-    set("s_overlapAreaMinFp", random.Range(-1, 60));
-    set("s_overlapAreaMinNoMove", random.Range(-1, 60));
+    const FrameSize size = SensorSize(random);
+    SetSensor(random, mode, size, params);
+    SetTilesOfSensor(random, size, params);
     return params;
+}
+
+ParamBlock SameSensorParams(SimRandom& random, const ParamBlock& params) {
+    ParamBlock changed = params;
+    for (size_t i = 0; i < changed.size(); ++i) {
+        if (!IsGeometry(host::ParamTable()[i].name) && random.Chance(16))
+            changed[i] = Around(random, changed[i]);
+    }
+    SetFlags(random, changed);
+    if (random.Chance(50))
+        SetTilesOfSensor(random, PictureSize(params), changed);
+    return changed;
+}
+
+FrameSize PictureSize(const ParamBlock& params) {
+    constexpr int32_t kMostSide = 4096;
+    constexpr int32_t kMostPixels = 1 << 16;
+    const host::Geometry geometry = host::GeometryOf(params);
+    for (const int32_t factor :
+         {geometry.blockWidth, geometry.blockColNum, geometry.blockHeight, geometry.blockRowNum}) {
+        if (factor < 1 || factor > kMostSide)
+            return {64, 64};
+    }
+    const bool fits = int64_t{geometry.Width()} * geometry.Height() <= kMostPixels;
+    return fits ? FrameSize{geometry.Width(), geometry.Height()} : FrameSize{64, 64};
+}
+
+int32_t RandomFrameCount(SimRandom& random, FrameSize size) {
+    const size_t pixels = size.Pixels();
+    if (pixels > 10000)
+        return random.Range(2, 3);
+    if (pixels > 3000)
+        return random.Range(2, 6);
+    return random.Chance(1) ? 110 : random.Range(2, 12);
 }
 
 ParamBlock HostileParams(SimRandom& random, host::Mode mode) {
@@ -112,6 +174,26 @@ ParamBlock HostileParams(SimRandom& random, host::Mode mode) {
     return params;
 }
 
+namespace {
+
+// Byte comparisons of the search at most: four wide templates and four tall ones.
+double SearchWork(const ParamBlock& params) {
+    const auto value = [&params](const char* name) {
+        return static_cast<double>(ParamValue(params, name));
+    };
+    const double width = std::max(value("s_templateWidth"), 0.0);
+    const double height = std::max(value("s_templateHeight"), 0.0);
+    const double rows = value("s_centerHeight") + 1;
+    const double columns =
+        value("s_boundHeight") + value("s_centerWidth") - value("s_boundWidth") + 1;
+    const auto placements = [rows, columns](double w, double h) {
+        return std::max(rows - h, 0.0) * std::max(columns - w, 0.0);
+    };
+    return 4 * (placements(width, height) + placements(height, width)) * width * height;
+}
+
+}  // namespace
+
 bool CheapEnough(const ParamBlock& params) {
     const auto value = [&params](const char* name) {
         return static_cast<double>(ParamValue(params, name));
@@ -127,7 +209,7 @@ bool CheapEnough(const ParamBlock& params) {
         (2 * value("s_smallMoveTolRow") + 1) * (2 * value("s_smallMoveTolCol") + 1) * image;
     constexpr double kCheap = 4e6;
     constexpr double kRefused = 268435456;  // 2^28
-    const double work = match + shifts;
+    const double work = match + shifts + SearchWork(params);
     return work < kCheap || work > 4 * kRefused;
 }
 

@@ -8,15 +8,26 @@
 
 #include "ParamTable.h"
 #include "SimMath.h"
+#include "StepSizes.h"
 
 namespace fpnavi_test {
 
 // The mode's defaults with about one in six of the thresholds and flags drawn anew around theirs.
 host::ParamBlock VariedParams(host::SimRandom& random, host::Mode mode);
 
-// Another sensor: block grid, tiles, gaps, templates and candidate number drawn, small enough for
-// the plain model; one in eight has tiles that do not match the image.
+// Another sensor of 1 x 1 to 200 x 200 pixels, its sides often at the edges: block grid, tiles,
+// gaps, templates and candidate number drawn, the larger the frame the fewer comparisons for the
+// plain model; one in sixteen has tiles that do not match the image.
 host::ParamBlock OtherGeometryParams(host::SimRandom& random, host::Mode mode);
+
+// The same sensor with other tiles, templates and thresholds.
+host::ParamBlock SameSensorParams(host::SimRandom& random, const host::ParamBlock& params);
+
+// Sides of the frames of a gesture under params; 64 x 64 where these make no sense.
+FrameSize PictureSize(const host::ParamBlock& params);
+
+// Frames of a gesture: few of large ones.
+int32_t RandomFrameCount(host::SimRandom& random, FrameSize size);
 
 // One in twelve of the values at a boundary of its type or of sense.
 host::ParamBlock HostileParams(host::SimRandom& random, host::Mode mode);
@@ -31,6 +42,11 @@ class MovingPicture {
   public:
     MovingPicture(uint64_t seed, int32_t width, int32_t height);
     std::vector<uint8_t> Next();
+    // The frames from now on.
+    void SetSize(int32_t width, int32_t height) {
+        m_width = width;
+        m_height = height;
+    }
 
   private:
     uint8_t GreyAt(int32_t column, int32_t row) const;

@@ -47,12 +47,12 @@ std::vector<uint8_t> NextGreys(host::SimRandom& random, const std::vector<uint8_
 // Class maps: full, empty, outlines, noise; also with the classes 2 and 255.
 std::vector<uint8_t> RandomTypes(host::SimRandom& random, FrameSize size);
 
-// Fills the room behind the pixels of both buffers: with value, or, below 0, with random bytes.
+// Fills the space behind the pixels of both buffers: with value, or, below 0, with random bytes.
 constexpr int32_t kRandomJunk = -1;
 void FillRoom(::NaviFrame_t* img, int32_t value);
 
 // The same frame for both sides, each with heap buffers of exactly the bytes that its steps may
-// touch; the room behind the module's pixels is full of junk. Measures start as numbers that no
+// touch; the space behind the module's pixels is full of junk. Measures start as numbers that no
 // step leaves there by chance.
 class TwinFrame {
   public:

@@ -33,8 +33,8 @@ TemplateSize RandomTemplate(SimRandom& random, FrameSize size, int32_t bound) {
     return {random.Range(1, std::clamp(least, 1, 20)), random.Range(1, std::clamp(bound, 1, 8))};
 }
 
-// Byte comparisons of the plain model's searches.
-bool CheapSearch(const ParamBlock& params) {
+// Neither the search nor the match of a pair takes more byte comparisons.
+bool CheapSearch(const ParamBlock& params, double most) {
     const auto value = [&params](const char* name) {
         return static_cast<double>(ParamValue(params, name));
     };
@@ -44,7 +44,7 @@ bool CheapSearch(const ParamBlock& params) {
     const double search = 8 * std::max(value("s_centerWidth"), 1.0) *
                           std::max(value("s_centerHeight"), 1.0) * value("s_templateWidth") *
                           value("s_templateHeight");
-    return search < 2e6 && full * value("s_candidateNum") < 1e6 && full < 4e5;
+    return search < most && full * value("s_candidateNum") < most && full < 4e5;
 }
 
 // A border for a side; half of them small enough that templates find placements.
@@ -88,11 +88,15 @@ void SetTiles(ParamBlock& params, FrameSize size, int32_t bound, int32_t gap) {
     ParamValue(params, "s_gapHeight") = gap;
 }
 
-ParamBlock RandomSearchParams(SimRandom& random, FrameSize size) {
-    ParamBlock params = host::ParamsForMode(host::Mode::Fp, false);
+void DrawSearch(SimRandom& random, FrameSize size, double most, ParamBlock& params) {
     do {
         DrawTiles(random, size, params);
-    } while (!CheapSearch(params));
+    } while (!CheapSearch(params, most));
+}
+
+ParamBlock RandomSearchParams(SimRandom& random, FrameSize size) {
+    ParamBlock params = host::ParamsForMode(host::Mode::Fp, false);
+    DrawSearch(random, size, 1e6, params);
     const auto set = [&params](const char* name, int32_t value) {
         ParamValue(params, name) = value;
     };

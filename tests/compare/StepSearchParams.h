@@ -13,6 +13,10 @@ namespace fpnavi_test {
 // Tiles, gaps, templates and thresholds for an image of size: fitting ones for the most part.
 host::ParamBlock RandomSearchParams(host::SimRandom& random, FrameSize size);
 
+// The same without the thresholds: tiles, gaps, templates and the number of candidates. most: byte
+// comparisons of the search and of the match, each, that the plain model may take.
+void DrawSearch(host::SimRandom& random, FrameSize size, double most, host::ParamBlock& params);
+
 // Tiles of the whole image: borders of bound, gaps of gap, the centre between them.
 void SetTiles(host::ParamBlock& params, FrameSize size, int32_t bound, int32_t gap);
 

@@ -1,4 +1,4 @@
-// No result depends on what was done before: not on the calls made, nor on what lies in the room
+// No result depends on what was done before: not on the calls made, nor on what lies in the space
 // behind a frame's pixels.
 #include <gtest/gtest.h>
 

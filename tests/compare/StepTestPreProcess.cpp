@@ -171,7 +171,7 @@ TEST(StepImgPreProcess, RandomFramesComeOutTheSame) {
     words.ExpectAll();
 }
 
-// Every width of one word and a little more. Buffers end with the room behind the last pixel, so
+// Every width of one word and a little more. Buffers end with the space behind the last pixel, so
 // that the address sanitizer sees a step that reads or writes on.
 TEST(StepImgPreProcess, EverySizeStaysInItsRoom) {
     SimRandom random = StepRandom(132, 0);

@@ -61,7 +61,7 @@ constexpr int32_t kWidths[] = {40, 56, 63, 64, 65, 127, 128, 129};
 // fails.
 TEST(StepCalcImgJointTrap, TiesAreDecidedByTheHeapsOrder) {
     const int64_t cases = StepCases(1500);
-    CaseClasses tied("tied", {"1_to_16", "more"});
+    int32_t many = 0;  // ties of more displacements than are sought one by one
     int32_t decided = 0;
     for (int64_t i = 0; i < cases; ++i) {
         SimRandom random = StepRandom(511, i);
@@ -83,11 +83,12 @@ TEST(StepCalcImgJointTrap, TiesAreDecidedByTheHeapsOrder) {
         // Equal coverage: the templates are the current frame's, and rows count upwards.
         ASSERT_EQ(::PrintNaviLog()->dy_fp[0], ties.byHeap.first) << "case " << i;
         ASSERT_EQ(::PrintNaviLog()->dx_fp[0], -ties.byHeap.second) << "case " << i;
-        tied.Note(ties.best.size() <= 16 ? 0 : 1);
+        many += ties.best.size() > 16 ? 1 : 0;
         decided += ties.byHeap != ties.byKey ? 1 : 0;
     }
-    tied.ExpectAll();
+    EXPECT_GT(many, 0);
     EXPECT_GT(decided, 0);
+    RecordProperty("many", many);
     RecordProperty("decided", decided);
 }
 

@@ -1,5 +1,6 @@
 #include "Twin.h"
 
+#include <algorithm>
 #include <cstring>
 
 #include "FailingMalloc.h"
@@ -47,6 +48,7 @@ void Twin::Clear() {
     ::FpNaviClear();
     reference::FpNaviClear();
     Check("FpNaviClear", 0, 0);
+    CompareImages("FpNaviClear", kImageBytes);  // nothing was written behind the frames
 }
 
 void Twin::Zones(uint32_t reg24, uint32_t reg28) {
@@ -58,8 +60,8 @@ void Twin::Block(const std::vector<uint8_t>& raw, int32_t width) {
     const int32_t module = ::GetNaviBlock(raw.data(), width, 0, m_image.data());
     Check("GetNaviBlock", module,
           reference::GetNaviBlock(raw.data(), width, 0, m_imageReference.data()));
-    if (m_image != m_imageReference)
-        Differ("GetNaviBlock: the images differ");
+    CompareImages("GetNaviBlock", static_cast<size_t>(fpnavi::s_imageWidth) *
+                                      static_cast<size_t>(fpnavi::s_imageHeight));
 }
 
 void Twin::Status(bool nullFrame) {
@@ -182,6 +184,11 @@ void Twin::CompareFrames(const std::string& call) {
         Differ(call + ": s_fullImageCurr differs");
     if (!SameFrame(fpnavi::s_fullImagePrev, reference::s_fullImagePrev))
         Differ(call + ": s_fullImagePrev differs");
+}
+
+void Twin::CompareImages(const std::string& call, size_t bytes) {
+    if (std::memcmp(m_image.data(), m_imageReference.data(), std::min(bytes, kImageBytes)) != 0)
+        Differ(call + ": the images differ");
 }
 
 void Twin::CompareFlags(const std::string& call) {

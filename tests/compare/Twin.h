@@ -49,6 +49,7 @@ class Twin {
     void Differ(const std::string& what);
     void CompareRecord(const std::string& call);
     void CompareFrames(const std::string& call);
+    void CompareImages(const std::string& call, size_t bytes);
     void CompareFlags(const std::string& call);
     void CompareTuning(const std::string& call);
     void CompareLogs(const std::string& call);

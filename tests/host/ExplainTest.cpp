@@ -1,4 +1,4 @@
-// The frame-by-frame trace: which gate or test settled each pair, for gestures built to meet each.
+// The frame-by-frame trace: which gate or test decided each pair, for gestures built to meet each.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <sys/wait.h>

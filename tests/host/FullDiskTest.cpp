@@ -1,5 +1,5 @@
 // The command on a disk that is full after any number of bytes: it says so, all that was there
-// stays, no gesture is half there, and with room again the work goes on.
+// stays, no gesture is stored in part, and with free space again the work goes on.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <sched.h>
@@ -165,7 +165,7 @@ TEST_F(FullDisk, OfARealFileSystem) {
     EXPECT_EQ(WEXITSTATUS(status), 0);
 }
 
-// What cannot be written to stdout is an error too; the corpus is written all the same.
+// What cannot be written to stdout is an error too; the corpus is written nevertheless.
 TEST_F(FullDisk, OfStdout) {
     ASSERT_EQ(RunCommand(Synth(m_path, 0, kFormer, false)).exitCode, 0);
     const std::string fng = m_directory + "/g.fng";

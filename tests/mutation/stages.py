@@ -9,7 +9,7 @@ from dataclasses import dataclass, field, replace
 
 from tree import PLAIN, Failure, run
 
-# Rooms whose tests stand in the file of another.
+# Files of the module whose tests are in the test file of another.
 _TESTED_IN = {
     'BiThreshold': 'PreProcess', 'FingerRidge': 'PreProcess', 'StretchRange': 'PreProcess',
     'FramePair': 'FingerNoMove', 'Templates': 'FindCandidate', 'TemplatePieces': 'FindCandidate',
@@ -19,7 +19,7 @@ _TESTED_IN = {
     'WordLanes': 'FingerDetect', 'SetNaviParam': 'NaviParam', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
     'NaviVoteInfo': 'Gesture', 'NaviMode': 'NaviParam',
 }
-# Rooms that the step tests do not call.
+# Files that the step tests do not call.
 _NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneHistogram',
              'TuneMeasure', 'TuneRegisters', 'NaviBlock', 'alog_host'}
 _COMPARED = {'FPNAVI_COMPARE_GESTURES': '200', 'FPNAVI_HOSTILE_BLOCKS': '60'}
@@ -70,7 +70,7 @@ def _why(code, log):
 
 
 def _suites(tree, stem):
-    """gtest filter for the suites in the test files of a room; empty without any."""
+    """gtest filter for the suites in the test files of a step; empty without any."""
     suites = set()
     for name in (stem, _TESTED_IN.get(stem, stem)):
         for path in (tree.copy / 'tests/unit').glob(f'{name}*Test.cpp'):

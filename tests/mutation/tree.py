@@ -80,7 +80,7 @@ class Tree:
         run(command, cwd=self.build)
 
     def sanitized(self, name):
-        """The sanitized twin of a module's object."""
+        """The object of a module's file compiled with the sanitizers."""
         return self.build / 'sanitized' / name
 
     @staticmethod

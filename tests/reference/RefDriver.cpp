@@ -1,6 +1,6 @@
 // The frame-pair driver: OrientationCalc takes a frame, keeps the previous one and hands the pair
 // to OrntCalcProcess, which runs the methods in order of cost and fills one entry of the record.
-// A failure empties both frames, so the rest of the gesture fails too.
+// A failure empties both frames, so all further frames of the gesture fail too.
 
 #include <cstdint>
 #include <initializer_list>

@@ -346,7 +346,7 @@ int32_t GetGreyRange(const uint8_t* buffer, int32_t* range);
 
 // ---- Tuning ------------------------------------------------------------------------------------
 
-// 1 when the call goes on, 0 when the DC value was too low and another frame is asked for.
+// 1 when the call goes on, 0 when the DC value was too low and another frame is needed.
 int32_t _NAVI_Tune_Init(const uint8_t* img, uint32_t* iTuneDAC, const uint32_t* iGain20,
                         const uint32_t* iGain2C);
 void _NAVI_Tune_Process();

@@ -1,8 +1,8 @@
 // Every allocation of a gesture fails, alone and from there on for good: results and state are the
 // model's, nothing leaks, and the next gesture is the one of a fresh process.
 //
-// Pairs: a failure ends the frame after at most one more attempt and leaves the rest of the gesture
-// without any, so two failures of one gesture are neighbours, that is the failure for good
+// Pairs: after a failure the frame makes at most one more attempt, and later frames of the gesture
+// make none. So two failures of one gesture are neighbours, which is the failure for good
 // (AtMostOneAttemptFollows). Pairs across two gestures are run one by one.
 #include <gtest/gtest.h>
 #include <sys/wait.h>

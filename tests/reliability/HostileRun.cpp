@@ -76,7 +76,7 @@ void NotePair(Reached* reached) {
                            s_imageCurr.cvr >= s_coverageMinFp);
 }
 
-// The status is asked last: an absent finger ends the gesture.
+// The finger status comes last: an absent finger ends the gesture.
 Reached RunTwin(const ParamBlock& params, Mode mode, uint64_t seed) {
     Twin& twin = Twin::Get();
     Frames frames(params, seed, kTwinBytes);

@@ -1,4 +1,4 @@
-"""Where the braces of if, else, for and while are not as the house style has them.
+"""Where the braces of if, else, for and while are not as the style of the project has them.
 
 A single simple statement has none, also when it takes two lines. A body of several statements, one
 that is a control statement itself and one with a comment of its own have some; so does an assertion

@@ -113,14 +113,14 @@ class PlantedIncludes(unittest.TestCase):
 class Braces(unittest.TestCase):
     """Of the tree."""
 
-    def test_are_as_the_house_style_has_them(self):
+    def test_are_in_the_style_of_the_project(self):
         found = [f'{file}:{line}: {what}' for file, text in includes.read_sources(_ROOT).items()
                  for line, what in braces.findings(text)]
         self.assertEqual(found, [])
 
 
 class PlantedBraces(unittest.TestCase):
-    """Statements in and out of the house style."""
+    """Statements with right and with wrong braces."""
 
     def finds(self, text, *expected):
         self.assertEqual(braces.findings(text), list(expected))

@@ -23,7 +23,7 @@ class NaviTest : public ::testing::Test {
     void TearDown() override;
 };
 
-// A frame over buffers of the test's own, with the room behind the pixels that navigation frames
+// A frame over buffers of the test's own, with the space behind the pixels that navigation frames
 // have, filled with junk; never give it to a function that frees buffers.
 class TestFrame {
   public:

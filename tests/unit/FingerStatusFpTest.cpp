@@ -16,7 +16,8 @@ class FpDetect : public NaviTest {
   protected:
     int32_t Detect(TestFrame& frame) {
         m_params.Apply();
-        return NavFingerDetectFp(frame.Greys().data());
+        m_image = frame.Greys();
+        return NavFingerDetectFp(m_image.data());
     }
     static int32_t GreyRange(TestFrame& frame) {
         int32_t range = -7;
@@ -36,6 +37,7 @@ class FpDetect : public NaviTest {
             .Set("s_blockRowNumFp", 1);
     }
     Params m_params;
+    std::vector<uint8_t> m_image;  // of the last call, without room behind it
 };
 
 TEST_F(FpDetect, TextureTestGetsTheFrameItsSizeAndThePresets) {

@@ -196,13 +196,18 @@ TEST(Pairing, EveryRunOfColumns) {
     }
 }
 
-TEST(Pairing, NoRowsMeetNothing) {
+TEST(Pairing, RowsThatMeetNothingHaveNoAreaAndNoSum) {
     TestFrame frame(20, 5, 9, 1);
     const LaidFrame laid = LayOut(*frame.Get());
     const Meeting none = {0, 0, 0, {}};
     const Columns columns = CutColumns({0, 20, 1, {{0, 20}}});
     EXPECT_EQ(CommonArea(laid, laid, {&none, &columns}), 0);
     EXPECT_EQ(DifferenceSum(laid, laid, {&none, &columns}, 1), 0);
+}
+
+TEST(CutColumns, ColumnsThatMeetNothingAreEmpty) {
+    EXPECT_TRUE(CutColumns({0, 0, 0, {}}).Empty());
+    EXPECT_FALSE(CutColumns({0, 1, 1, {{7, 8}}}).Empty());
 }
 
 // A limit of none is reached before anything is read.

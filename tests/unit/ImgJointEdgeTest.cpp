@@ -108,18 +108,20 @@ TEST_F(ImgJointFrames, FramesOfDifferentSizesAreRefused) {
     ExpectRefused();
 }
 
-// Equal frames, so that every pixel that is compared gives 0. Each defect leaves the other three
-// conditions of an axis true.
+// Equal frames, so that every pixel that is compared gives 0. Each defect leaves the other
+// conditions of an axis true; full images have sides of at most 4096.
 TEST_F(ImgJointFrames, TilesThatDoNotMakeUpASideMeetNowhere) {
     struct Tiles {
         int32_t bound, center, gap, score;
     };
-    const std::vector<Tiles> wide = {{8, 40, 32, 0},    {0, 56, 0, 0},     {28, 0, 1, 0},
-                                     {-1, 58, 32, 255}, {29, -2, 32, 255}, {8, 40, -1, 255},
-                                     {8, 39, 32, 255},  {8, 41, 0, 255}};
-    const std::vector<Tiles> high = {{8, 20, 16, 0},    {0, 36, 0, 0},     {18, 0, 1, 0},
-                                     {-1, 38, 16, 255}, {19, -2, 16, 255}, {8, 20, -1, 255},
-                                     {8, 19, 16, 255},  {8, 21, 0, 255}};
+    const std::vector<Tiles> wide = {
+        {8, 40, 32, 0},    {0, 56, 0, 0},      {28, 0, 1, 0},         {-1, 58, 32, 255},
+        {29, -2, 32, 255}, {8, 40, -1, 255},   {8, 39, 32, 255},      {8, 41, 0, 255},
+        {8, 40, 2020, 0},  {8, 40, 2021, 255}, {8, 40, 1 << 30, 255}, {INT32_MAX, 40, 32, 255}};
+    const std::vector<Tiles> high = {
+        {8, 20, 16, 0},    {0, 36, 0, 0},      {18, 0, 1, 0},         {-1, 38, 16, 255},
+        {19, -2, 16, 255}, {8, 20, -1, 255},   {8, 19, 16, 255},      {8, 21, 0, 255},
+        {8, 20, 2030, 0},  {8, 20, 2031, 255}, {8, 20, 1 << 30, 255}, {INT32_MAX, 20, 16, 255}};
     TestFrame frame(56, 36, 10, 1);
     ASSERT_EQ(ImgCopy(&s_imagePrev, frame.Get()), 0);
     ASSERT_EQ(ImgCopy(&s_imageCurr, frame.Get()), 0);

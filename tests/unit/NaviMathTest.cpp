@@ -39,7 +39,7 @@ TEST(WrapArithmetic, KeepsTheLow32Bits) {
     EXPECT_EQ(WrapSubU(0U, 1U), 0xFFFFFFFFU);
 }
 
-TEST(WrapArithmetic, SmallestIntegerHasNoPositiveTwin) {
+TEST(WrapArithmetic, AbsOfTheSmallestIntegerIsItself) {
     EXPECT_EQ(WrapAbs(kMin), kMin);
     EXPECT_EQ(WrapAbs(-5), 5);
     EXPECT_EQ(WrapAbs(5), 5);

@@ -84,7 +84,7 @@ int32_t PlainSum(TestFrame& cut, TestFrame& searched, const Template& tplt, cons
     return sum;
 }
 
-// One piece at one block that ends with the frame, so that strips reach into the room behind it.
+// One piece at one block that ends with the frame, so that strips reach into the space behind it.
 struct BlockTest {
     PlacementBlock block;
     Piece piece;

@@ -113,7 +113,7 @@ TEST_F(TuneRuns, MeanOutsideOnTwoCallsCompletesAtTheSecondByTheLimit) {
     EXPECT_EQ(_NAVI_TimeOut, 1);
     EXPECT_EQ(s_tuneOkFlag, 0);
     EXPECT_EQ(Tune(187, 230), 1);
-    EXPECT_EQ(m_registers.dac, 174U) << "the last step is written all the same";
+    EXPECT_EQ(m_registers.dac, 174U) << "the last step is written too";
     EXPECT_EQ(_NAVI_NoMoreProcess, 2U);
     EXPECT_EQ(_NAVI_TimeOut, 0);
     EXPECT_EQ(Tune(174, 230), 0) << "a run of its own";

@@ -141,7 +141,7 @@ TEST_F(TuneStep, RecommendedMeanOutOfTheEffectiveBandMovesNothingAndEnds) {
     EXPECT_EQ(_NAVI_flag_recommend, 0);
     EXPECT_EQ(_NAVI_delta_dc_orient, 0);
     EXPECT_EQ(_NAVI_delta_dc_val, 0U);
-    EXPECT_EQ(_NAVI_delta_dc_val_mean, 2U) << "1000 / 374, computed all the same";
+    EXPECT_EQ(_NAVI_delta_dc_val_mean, 2U) << "1000 / 374, computed nevertheless";
     EXPECT_EQ(_NAVI_NoMoreProcess, 0U);
     EXPECT_EQ(m_registers.dac, 200U);
 }

@@ -1,4 +1,4 @@
-// What the tests of the tuning rooms share: frames with given corners, one call of _NAVI_Tune, a
+// What the tests of the tuning share: frames with given corners, one call of _NAVI_Tune, a
 // snapshot of the tuning's state, and a fixture that starts each test after a completed run.
 #ifndef TESTS_UNIT_TUNETESTSUPPORT_H
 #define TESTS_UNIT_TUNETESTSUPPORT_H

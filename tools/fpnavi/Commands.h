@@ -1,5 +1,5 @@
 // The subcommands of fpnavi. Each adds its options to the program and says what to run when it is
-// the one that was asked for.
+// the one that the arguments name.
 #ifndef FPNAVI_TOOLS_COMMANDS_H
 #define FPNAVI_TOOLS_COMMANDS_H
 

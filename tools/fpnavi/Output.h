@@ -44,7 +44,7 @@ std::string Printable(const std::string& text);
 // "fpnavi: message" on stderr.
 void WriteError(const std::string& message);
 
-// A column of a text table. Wider cells push the rest of their line to the right.
+// A column of a text table. A cell wider than its column moves those after it to the right.
 struct Column {
     std::string title;
     size_t width = 0;  // at least; the title's width if that is more

@@ -53,8 +53,8 @@ typedef struct NaviFrame_t {
     int32_t yc;     /* centroid row, percent of the height from the centre, upwards */
 } NaviFrame_t;
 
-/* The vote record of one gesture. Frame arrays (xc, yc, cvr and their _ds twins) hold the previous
- * frame of pair n at n and its current frame at n + 1; the others hold pair n at n. */
+/* The vote record of one gesture. Frame arrays (xc, yc, cvr, xc_ds, yc_ds, cvr_ds) hold the
+ * previous frame of pair n at n and its current frame at n + 1; the others hold pair n at n. */
 typedef struct NaviVoteInfo_t {
     int32_t calc_cnt;                      /* pairs entered so far */
     int32_t xc[FPNAVI_VOTE_CAPACITY];      /* centroid columns of frames, percent */
@@ -136,9 +136,9 @@ FPNAVI_API NaviVoteInfo_t* PrintNaviLog(void);
 /* Sorts a raw block-ordered sensor frame into an image, row by row.
  *
  * p_data_origin: image width x height bytes, block after block (left to right, then down), each
- * block row by row; the caller's. p_data_resort: room for the image, the caller's, not overlapping.
- * width: bytes of the row that is replaced by the one below it when direction control is 1 in
- * mode 2, normally the image width; bytes beyond the image are neither read nor written.
+ * block row by row; the caller's. p_data_resort: as many bytes for the image; the caller's, not
+ * overlapping. width: bytes of the row that is replaced by the one below it when direction control
+ * is 1 in mode 2, normally the image width; bytes beyond the image are neither read nor written.
  * height: not used. The geometry is that of SetNaviParam.
  * Returns 0, or -1 for a null pointer or a geometry that is not set or makes no sense (block
  * sizes or counts below 1, a side above 4096 pixels); nothing is written then. */

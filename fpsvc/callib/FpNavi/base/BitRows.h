@@ -22,14 +22,19 @@ inline uint64_t FirstBits(int32_t count) {
     return count >= kWordPixels ? ~uint64_t{0} : (uint64_t{1} << count) - 1;
 }
 
+// All bits from first on; 0 <= first < 64. Shifted twice, so that no set bit is shifted out.
+inline uint64_t BitsFrom(int32_t first) {
+    return ~uint64_t{0} >> first << first;
+}
+
 // The bits from first up to but without last; 0 <= first < last, first < 64.
 inline uint64_t BitsBetween(int32_t first, int32_t last) {
     const uint64_t all = ~uint64_t{0};
-    return all << first & (last < kWordPixels ? all >> (kWordPixels - last) : all);
+    return BitsFrom(first) & (last < kWordPixels ? all >> (kWordPixels - last) : all);
 }
 
-// Bit c is set where byte c of the width bytes at row is at most value; 1 <= width <= 64. Reads up
-// to 15 bytes behind them.
+// Bit c is set where row[c] <= value. row [in]: width bytes, 1 <= width <= 64, of which up to 15
+// bytes behind the last are read too.
 inline uint64_t AtMostBits(const uint8_t* row, int32_t width, uint8_t value) {
     const Bytes16 most = Splat16(value);
     uint64_t bits = 0;
@@ -40,7 +45,7 @@ inline uint64_t AtMostBits(const uint8_t* row, int32_t width, uint8_t value) {
     return bits & FirstBits(width);
 }
 
-// A byte for each bit: 1 where it is set, else 0. For each value of eight bits.
+// bytes[value][bit] is that bit of value, 0 or 1.
 struct SpreadTable {
     uint8_t bytes[256][8];
 };

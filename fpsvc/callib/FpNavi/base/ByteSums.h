@@ -10,15 +10,17 @@ namespace fpnavi {
 
 inline constexpr int32_t kMostSummed = 1 << 22;  // bytes: 255 * 2^22 < 2^30
 
-// Sixteen bytes from rest on keep the last rest of sixteen.
+// Sixteen bytes from kLastBytes + n on are a mask of the last n of sixteen; 0 <= n <= 16.
 inline constexpr uint8_t kLastBytes[2 * kLanes] = {
     0,   0,   0,   0,   0,   0,   0,   0,   0,   0,   0,   0,   0,   0,   0,   0,
     255, 255, 255, 255, 255, 255, 255, 255, 255, 255, 255, 255, 255, 255, 255, 255};
 
-// Sum of a block of the frame: height rows of width bytes, the first at frame[first], each stride
-// behind the one before; at most kMostSummed bytes. The end of a row is read with the bytes before
-// it, which are masked; only rows that end within the first sixteen bytes of the frame are too near
-// to its start for that.
+// Sum of a block of a frame: height rows of width bytes, stride bytes apart, at most kMostSummed
+// bytes in all.
+//   frame [in]  the caller's; no byte before it or behind the block's last row is read
+//   first       index in frame of the block's first byte
+// The end of a row is read together with the bytes before it, which are masked. A row that ends
+// within the first 15 bytes of frame has too few bytes before its end and is summed byte by byte.
 inline int32_t SumBlock(const uint8_t* frame, int32_t first, int32_t width, int32_t height,
                         int32_t stride) {
     const Bytes16 last = Load16(kLastBytes + width % kLanes);

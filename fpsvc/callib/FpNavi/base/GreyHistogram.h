@@ -12,18 +12,17 @@ namespace fpnavi {
 inline constexpr int32_t kGreyLevels = 256;
 inline constexpr int32_t kBlocksCounted = 4;
 
-// Counts bytes by value. Four histograms take turns: neighbours are often equal, and each would
-// wait for the store of the one before.
+// Counts bytes by value. Four histograms: equal neighbours in one table would serialise on
+// store-to-load forwarding.
 class ByteCounter {
   public:
-    // Counts the bytes from values on; less than 2^31 in all calls.
+    // Counts the count bytes at values [in]; less than 2^31 bytes in all calls.
     void Add(const uint8_t* values, int32_t count) {
+        constexpr int32_t kUnrolled = 8;
         int32_t i = 0;
-        for (; i + 4 <= count; i += 4) {
-            ++m_turns[0][values[i]];
-            ++m_turns[1][values[i + 1]];
-            ++m_turns[2][values[i + 2]];
-            ++m_turns[3][values[i + 3]];
+        for (; i + kUnrolled <= count; i += kUnrolled) {
+            for (int32_t n = 0; n < kUnrolled; ++n)
+                ++m_turns[n & 3][values[i + n]];
         }
         for (; i < count; ++i)
             ++m_turns[i & 3][values[i]];
@@ -37,7 +36,7 @@ class ByteCounter {
     int32_t m_turns[4][kGreyLevels] = {};
 };
 
-// hist [out]: the count bytes at values, by value.
+// hist [out]: counts of the count bytes at values [in], by value.
 inline void CountBytes(const uint8_t* values, int32_t count, int32_t (&hist)[kGreyLevels]) {
     ByteCounter counter;
     counter.Add(values, count);
@@ -45,9 +44,12 @@ inline void CountBytes(const uint8_t* values, int32_t count, int32_t (&hist)[kGr
         hist[level] = counter.Of(level);
 }
 
-// Counts the pixels of four blocks side by side by grey level: hist[b][grey] of block b. greys:
-// first pixel of the first block; each block has height rows of width pixels, stride apart. A pixel
-// of each block in turn: equal neighbours in one table would serialise on store-to-load forwarding.
+// Counts the pixels of four blocks that lie side by side, by grey level.
+//   greys [in]  first pixel of the first block; blocks have height rows of width pixels, rows are
+//               stride bytes apart
+//   hist [out]  hist[b][grey]: pixels of block b
+// One pixel of each block in turn: equal neighbours in one table would serialise on store-to-load
+// forwarding.
 inline void CountFourBlocks(const uint8_t* greys, int32_t width, int32_t height, int32_t stride,
                             int32_t (&hist)[kBlocksCounted][kGreyLevels]) {
     std::memset(hist, 0, sizeof hist);
@@ -73,8 +75,8 @@ struct LevelGroup {
     int32_t first, below;
 };
 
-// First level of the group up to which more than limit pixels lie, the one behind the group without
-// one. No branch: where it lies cannot be predicted.
+// First level of the group up to which more than limit pixels lie; the level behind the group when
+// there is none. No branch: the position cannot be predicted.
 inline int32_t LevelAbove(const int32_t* hist, LevelGroup group, int32_t limit) {
     int32_t level = group.first;
     int32_t upTo = group.below;
@@ -85,9 +87,9 @@ inline int32_t LevelAbove(const int32_t* hist, LevelGroup group, int32_t limit) 
     return level;
 }
 
-// For each limit the first level up to which more than limit pixels lie, those of grey 0 not
-// counted; kGreyLevels without one. Limits are not negative. It lies in the last group below which
-// at most limit pixels lie.
+// For each limit the first level up to which more than limit pixels lie; kGreyLevels when there is
+// none. hist [in]: kGreyLevels counts; pixels of grey 0 are not counted. Limits are not negative.
+// The level lies in the last group below which at most limit pixels lie.
 inline LevelPair FirstLevelsAbove(const int32_t* hist, int32_t lowLimit, int32_t highLimit) {
     LevelGroup group = {0, -hist[0]};
     LevelGroup low = group;

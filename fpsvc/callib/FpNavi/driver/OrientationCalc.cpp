@@ -37,8 +37,8 @@ int32_t NextFrame(const uint8_t* data) {
     return OrntCalcProcess();
 }
 
-// A frame starts with measures of 0, and nothing but GetCenterAndCoverage changes them. To measure
-// one again that has no finger, or whose finger measures 0, changes nothing.
+// A frame starts with measures of 0, and only GetCenterAndCoverage changes them. So a frame whose
+// measures are all 0 is not measured yet, or measuring it again gives the same zeros.
 bool IsMeasured(const NaviFrame_t& img) {
     return img.cvr != 0 || img.xc != 0 || img.yc != 0;
 }
@@ -56,8 +56,8 @@ void RecordCenters(int32_t n) {
     s_voteInfo.cvr[n + 1] = s_imageCurr.cvr;
 }
 
-// The finger rests: the centroid moved only because the contact changed. Both ends of the pair get
-// that of the frame that shows more finger, the previous one on a tie.
+// The finger rests: the centroid moved only because the contact changed. Both frames of the pair
+// get the centroid of the frame that shows more finger, the previous one on a tie.
 void RecordRest(int32_t n) {
     s_voteInfo.dx_ct[n] = 0;
     s_voteInfo.dy_ct[n] = 0;
@@ -135,7 +135,7 @@ int32_t OrientationCalc(const uint8_t* data_prev, const uint8_t* data_curr, int3
     int32_t result = -1;
     if (GestureGeometryUsable())
         result = s_frameNum == 1 ? LoadFrame(data_curr) : NextFrame(data_curr);
-    // A failed frame leaves both empty, so that the rest of the gesture fails too.
+    // A failed frame leaves both empty, so that all further frames of the gesture fail too.
     if (result != 0) {
         ImgClear(&s_imageCurr);
         ImgClear(&s_imagePrev);

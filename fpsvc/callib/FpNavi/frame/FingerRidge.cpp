@@ -19,7 +19,8 @@ namespace {
 
 constexpr int32_t kPasses = 2;
 
-// The frame's bits: height rows of words each; scratch has as many words.
+// The frame's bits: height rows of words 64-bit words each, and scratch of the same size. Both lie
+// behind the greys of the frame.
 struct Rows {
     uint64_t* bits;
     uint64_t* scratch;
@@ -46,7 +47,7 @@ void FillRow(uint64_t* row, int32_t words) {
     int32_t last = words - 1;
     while (row[last] == 0)
         --last;
-    const uint64_t head = ~uint64_t{0} << __builtin_ctzll(row[first]);
+    const uint64_t head = BitsFrom(__builtin_ctzll(row[first]));
     const uint64_t tail = ~uint64_t{0} >> __builtin_clzll(row[last]);
     if (first == last) {
         row[first] = head & tail;
@@ -72,8 +73,8 @@ void FillColumns(const Rows& rows) {
     }
 }
 
-// Writes the classes row by row, sixteen at a time: what is too much is overwritten by the next
-// row, and behind the last row there is room.
+// Writes the classes row by row, sixteen at a time. Bytes beyond the end of a row are overwritten
+// by the next row; behind the last row they lie in the space behind the pixels.
 void WriteClasses(const Rows& rows, NaviFrame_t* img) {
     const uint64_t* word = rows.bits;
     for (int32_t row = 0; row < img->height; ++row) {

@@ -1,3 +1,14 @@
+// Requirement: area and difference sum of the pixels that are finger in both frames, at any of some
+// hundred displacements of a pair.
+//
+// Observation: with masks of 0 and 255 a difference that does not count is |0 - 0|, so that sixteen
+// pixel pairs take a few operations without a branch. The columns that meet are the same in all
+// rows.
+//
+// Algorithm: the masks of both frames are made once for each pair, the masks of the columns once
+// for each displacement of columns. Columns are cut into pieces of at most 64, of which the masks
+// stay in registers; a piece runs down all rows, and every four rows its sum is compared with the
+// limit.
 #include "frame/FramePair.h"
 
 #include <algorithm>
@@ -9,10 +20,10 @@ namespace fpnavi {
 namespace {
 
 constexpr int32_t kPieceSteps = kWordPixels / kLanes;  // of a piece
-constexpr int32_t kRowsPerCheck = 4;  // the sum is compared with the limit after these
+constexpr int32_t kRowsPerCheck = 4;  // rows summed up between two comparisons with the limit
 
-// Cuts the piece that starts at the first column of meeting from column on. Returns false when
-// there is none.
+// Makes piece [out] the one that starts at the first column >= column of meeting. Returns false,
+// with piece unchanged, when there is none.
 bool CutPiece(const Meeting& meeting, int32_t column, ColumnPiece* piece) {
     int32_t s = 0;
     while (s < meeting.count && meeting.spans[s].last <= column)
@@ -49,7 +60,7 @@ void ForEachPiece(const Columns& columns, Visit visit) {
     }
 }
 
-// Where the two frames are read: the same number of bytes behind all four is one pixel pair.
+// Where the two frames are read: byte n of all four pointers is one pixel pair.
 struct PixelPairs {
     const uint8_t* grey1;
     const uint8_t* mask1;
@@ -82,7 +93,7 @@ Sums AddRow(Sums sums, const PixelPairs& pairs, int32_t place, const Bytes16 (&m
     return sums;
 }
 
-// Sum over rows of a piece, width apart; stops at limit.
+// Sum of the differences over rows of a piece, width bytes apart; stops once it reaches limit.
 template <int32_t kSteps>
 int64_t SumRows(const PixelPairs& pairs, int32_t width, int32_t rows, const ColumnPiece& piece,
                 int64_t limit) {
@@ -101,7 +112,8 @@ int64_t SumRows(const PixelPairs& pairs, int32_t width, int32_t rows, const Colu
     return sum;
 }
 
-// Pixels in rows of a piece, width apart, that are finger in both frames; at most 2^24.
+// Pixels in rows of a piece, width bytes apart, that are finger in both frames; at most
+// 64 * 4096 = 2^18.
 template <int32_t kSteps>
 int32_t CountRows(const PixelPairs& pairs, int32_t width, int32_t rows, const ColumnPiece& piece) {
     const Bytes16 one = Splat16(1);
@@ -124,7 +136,7 @@ constexpr SumRowsOf kSumRows[kPieceSteps] = {SumRows<1>, SumRows<2>, SumRows<3>,
 constexpr CountRowsOf kCountRows[kPieceSteps] = {CountRows<1>, CountRows<2>, CountRows<3>,
                                                  CountRows<4>};
 
-// The spans of rows in the order in which they are summed up: those in the middle show more finger
+// The s-th span of rows in the order in which they are summed up: the middle one shows more finger
 // than the borders, so that a limit is reached with fewer rows.
 int32_t MiddleFirst(int32_t s, int32_t count) {
     return count < kBandMax ? s : (s == 0 ? 1 : (s == 1 ? 0 : 2));

@@ -1,5 +1,5 @@
 // Two frames laid out for comparison, and the comparison itself: the grey differences of the pixels
-// that are finger in both, at any displacement. Owns nothing; the mask of a frame lies in the room
+// that are finger in both, at any displacement. Owns nothing; the mask of a frame lies in the space
 // behind its classes.
 #ifndef FPNAVI_FRAMEPAIR_H
 #define FPNAVI_FRAMEPAIR_H
@@ -12,7 +12,8 @@
 
 namespace fpnavi {
 
-// What a comparison reads of a frame: rows of width bytes each, one behind the other.
+// What a comparison reads of a frame: height rows of width bytes, one behind the other. grey and
+// mask point into the frame's buffers; at least 15 bytes behind the last row can be read.
 struct LaidFrame {
     const uint8_t* grey;
     const uint8_t* mask;  // 255 where the pixel is finger, else 0
@@ -21,11 +22,11 @@ struct LaidFrame {
     int32_t area;  // pixels that are finger
 };
 
-// Fills the mask of img, which has pixels and room behind them. Valid until a buffer of img
-// changes.
+// Fills the mask of img, which has pixels and space behind them (FrameBytes). The result points
+// into the buffers of img and is valid until one of them changes.
 LaidFrame LayOut(const NaviFrame_t& img);
 
-// The working state of a frame pair: a value of whoever evaluates the pair, handed down to all
+// The working state of a frame pair: a value that the driver of the pair makes and passes to all
 // steps.
 struct FramePair {
     LaidFrame prev;
@@ -50,14 +51,14 @@ struct Span {
     int32_t Length() const { return last > first ? last - first : 0; }
 };
 
-// The places of span whose counterparts, offset further on, lie in other.
+// The places p of span for which p + offset lies in other.
 inline Span Meet(const Span& span, const Span& other, int32_t offset) {
     return {std::max(span.first, other.first - offset), std::min(span.last, other.last - offset)};
 }
 
 inline constexpr int32_t kBandMax = 3;  // border, centre, border
 
-// Places of one axis that meet those of the other frame at one offset: spans in ascending order,
+// Places p of one axis that meet p + offset of the other frame: count spans in ascending order,
 // none empty, none overlapping another.
 struct Meeting {
     int32_t offset;
@@ -73,15 +74,16 @@ struct Meeting {
     }
 };
 
-// Up to 64 neighbouring columns of a meeting: steps of sixteen reach from the first of them to the
-// last. The bytes of mask are 255 for the columns that meet, 0 for others and beyond the last step.
+// Up to 64 columns from column on, in steps of sixteen up to the last one that meets: the last step
+// reaches at most 15 columns beyond it. Bytes of mask: 255 for a column that meets, else 0.
 struct ColumnPiece {
     int32_t column;
     int32_t steps;
     Bytes16 mask[4];
 };
 
-// Columns that meet, none or some, with the first piece of them, which is all in most frames.
+// Columns that meet, and the first piece of them: with at most 64 columns there is no other. head
+// is undefined when none meets.
 struct Columns {
     Meeting meeting;
     ColumnPiece head;
@@ -91,19 +93,19 @@ struct Columns {
 
 Columns CutColumns(const Meeting& meeting);
 
-// Pixel (r, c) of the first frame meets (r + rows.offset, c + columns.offset) of the second, for
-// each place r of rows and c of columns. All of these lie inside both frames; columns are not
+// Pixel (r, c) of the first frame meets (r + offset of rows, c + offset of columns) of the second,
+// for each place r of rows and c of columns. All of these lie inside both frames; columns are not
 // empty.
 struct Pairing {
     const Meeting* rows;
     const Columns* columns;
 };
 
-// Pixels of the pairing that are finger in both frames.
+// Pixels of the pairing that are finger in both frames: at most 2^24.
 int32_t CommonArea(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing);
 
-// Sum of the grey differences over the pairing's common area. Stops early, with a sum of at least
-// limit, once limit is reached: a sum only grows.
+// Sum of the grey differences over the pairing's common area, at most 255 * 2^24. Once the sum
+// reaches limit it may stop and return what it has, at least limit.
 int64_t DifferenceSum(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing,
                       int64_t limit);
 

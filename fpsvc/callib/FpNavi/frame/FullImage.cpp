@@ -22,7 +22,7 @@ Bands CutBands(int32_t bound, int32_t center, int32_t gap) {
     return Bands{{0, bound + gap, bound + center + 2 * gap}, {bound, center, bound}};
 }
 
-// Bands are short and often of 8 or 40 pixels: a call for each would take longer than the copy.
+// Inline: bands are short, often of 8 or 40 pixels, and a call for each takes longer than the copy.
 inline void CopyBytes(const uint8_t* source, int32_t count, uint8_t* target) {
     for (; count >= kLanes; count -= kLanes, source += kLanes, target += kLanes)
         Store16(target, Load16(source));
@@ -45,7 +45,8 @@ void FillBytes(uint8_t value, int32_t count, uint8_t* target) {
     std::memset(target, value, static_cast<size_t>(count));
 }
 
-// Spreads one plane of the frame into the full image's; gap pixels are value.
+// Spreads one plane of the frame into that of the full image. source [in]: rows of the frame, one
+// behind the other; target [out]: rows of the full image; value: of gap pixels.
 void SpreadPlane(const uint8_t* source, const Bands& rows, const Bands& columns, uint8_t value,
                  uint8_t* target) {
     const int32_t bound = columns.length[0];

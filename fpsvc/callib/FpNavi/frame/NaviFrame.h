@@ -1,6 +1,7 @@
 // The navigation frame: its buffers and the three operations on it. Owns the four frames of a
-// gesture. Besides this room, pre-processing writes class map, greys and range of s_imageCurr, the
-// centroid method its cvr, xc, yc (and those of s_imagePrev), and FullImage fills the full images.
+// gesture. Besides NaviFrame.cpp, pre-processing writes class map, greys and range of s_imageCurr,
+// the centroid method its cvr, xc, yc (and those of s_imagePrev), and FullImage fills the full
+// images.
 #ifndef FPNAVI_NAVIFRAME_H
 #define FPNAVI_NAVIFRAME_H
 
@@ -34,19 +35,20 @@ int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src);
 // set.
 bool ReplaceBuffers(NaviFrame_t* img, int32_t bytes);
 
-// Both buffers of a navigation frame (not of a full image) have room behind the pixels for what
-// steps derive from them. Each step that uses the room fills it before it reads it: nothing in it
+// Both buffers of a navigation frame (not of a full image) have space behind the pixels for what
+// steps derive from them. Each step that uses the space fills it before it reads it: nothing in it
 // is kept from call to call.
 //
 //   pData: greys, width * height bytes; then the bit rows of the finger fill
-//   pType: classes, width * height bytes; then the mask of LayOut
+//   pType: classes, width * height bytes; then the mask of LayOut, width * height bytes
 //
-// The room starts at a multiple of 16 and lets a step of sixteen bytes read past the last pixel.
+// The space starts at a multiple of 16 and has at least 16 bytes more than the mask, so that a step
+// of sixteen bytes may read past the last pixel, and past the last byte of the mask.
 
 // Bytes of each buffer of a frame of these sides, 1..4096: below 2^26.
 int32_t FrameBytes(int32_t width, int32_t height);
 
-// Start of the room in a buffer of a frame of these sides.
+// Index of the first byte of that space in a buffer of a frame of these sides: a multiple of 16.
 int32_t RoomStart(int32_t width, int32_t height);
 
 // img has both buffers and at least one pixel.

@@ -32,15 +32,15 @@ struct BiThreshold {
     int32_t scale;  // likewise
 };
 
-// CalcBiThr of size pixels whose greys sum up to sum and are counted in hist.
-BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int64_t sum, int32_t size);
+// CalcBiThr of size pixels. hist [in]: their greys, counted.
+BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size);
 
-// StretchRange of a frame with pixels. hist [in, out]: all greys of img, counted; those of the
-// finger area afterwards. cutOff: percent.
+// StretchRange of a frame with pixels.
+//   img [in, out]   greys of the finger area are stretched
+//   scale           grey level of the upper percentile
+//   cutOff          the percentile, percent of the finger's pixels
+//   hist [in, out]  all greys of img, counted; those of the finger area afterwards
 void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t cutOff, int32_t (&hist)[kGreyLevels]);
-
-// The sum of count bytes.
-int64_t SumBytes(const uint8_t* values, int32_t count);
 
 }  // namespace fpnavi
 

@@ -1,4 +1,13 @@
 // StretchRange: the greys of the finger area stretched to the full scale.
+//
+// Requirement: in the finger area, the grey level of the cut-off percentile becomes 0, that of the
+// opposite percentile the full scale; greys in between linearly, truncated. Other pixels stay.
+//
+// Observation: the greys of the whole frame have been counted for the threshold. Those of the
+// finger are the same less the background, whose pixels come in runs.
+//
+// Algorithm: subtract the background run by run from that histogram, find both percentiles in it,
+// and stretch sixteen pixels at a time by a multiplication in place of the division.
 #include <algorithm>
 #include <cstdint>
 
@@ -19,7 +28,7 @@ struct GreySpan {
     int32_t max;
 };
 
-// 64 pixels from p on, fewer at the end of the frame: a bit for each that is not finger.
+// Bit i is set when pixel p + i is not finger: 64 pixels, fewer at the end of the frame.
 uint64_t BackgroundBits(const NaviFrame_t& img, int32_t p) {
     const Bytes16 one = Splat16(1);
     const int32_t count = std::min(img.width * img.height - p, kWordPixels);
@@ -29,7 +38,7 @@ uint64_t BackgroundBits(const NaviFrame_t& img, int32_t p) {
     return ~finger & FirstBits(count);
 }
 
-// Takes the pixels outside the finger area out of hist, run by run. Returns how many these are.
+// Subtracts the pixels outside the finger area from hist [in, out]. Returns their number.
 int32_t TakeOutBackground(const NaviFrame_t& img, int32_t (&hist)[kGreyLevels]) {
     ByteCounter counter;
     int32_t outside = 0;
@@ -49,9 +58,10 @@ int32_t TakeOutBackground(const NaviFrame_t& img, int32_t (&hist)[kGreyLevels]) 
     return outside;
 }
 
-// hist: counts by grey level, cnt their sum. The cumulative count crosses each limit, in hundredths
-// of a pixel, once at most, and not at all when level 0 lies beyond. A count above limit / 100,
-// truncated, is a hundredfold count above limit, so that no division rounds.
+// The percentiles of hist [in]; cnt: sum of its counts, at most 2^24. Limits are in hundredths of a
+// pixel. The cumulative count crosses each limit once at most, and not at all when level 0 alone
+// exceeds it: the level is then 0. For a limit >= 0, count > limit / 100 (truncated) is the same as
+// 100 * count > limit.
 GreySpan CutPercentiles(const int32_t (&hist)[kGreyLevels], int32_t cnt, int32_t cutOff) {
     const int32_t lo = WrapMul(cnt, cutOff);
     const int32_t hi = WrapMul(cnt, WrapSub(100, cutOff));
@@ -64,17 +74,17 @@ GreySpan CutPercentiles(const int32_t (&hist)[kGreyLevels], int32_t cnt, int32_t
             crossesHigh && levels.high < kGreyLevels ? levels.high : 0};
 }
 
-// The stretched grey is (grey - min) * scale / range, truncated and clamped; below min it is 0. The
-// division is a multiplication with scale / range in 1/2^16, rounded up: the product is too large
-// by less than 255 / 2^16, and a quotient lies at least 1 / range >= 1 / 255 below the next
-// integer.
+// The stretched grey is (grey - min) * scale / range, truncated and clamped to 255; below min it is
+// 0. The division is a multiplication by scale / range in units of 1/2^16, rounded up: the product
+// exceeds the quotient by less than 255 / 2^16 < 1 / 255, and a quotient that is no integer lies at
+// least 1 / range >= 1 / 255 below the next one.
 void StretchPixels(const GreySpan& span, uint32_t scale, NaviFrame_t* img) {
     const uint32_t range = static_cast<uint32_t>(span.max - span.min);
     const uint32_t factor = ((scale << 16) + range - 1) / range;  // at most 255 * 2^16
     const Bytes16 min = Splat16(static_cast<uint8_t>(span.min));
     const Bytes16 one = Splat16(1);
     const int32_t size = img->width * img->height;
-    // The last step reaches into the room behind the pixels, which nobody reads.
+    // The last step also changes bytes in the space behind the pixels; nothing reads those.
     for (int32_t p = 0; p < size; p += kLanes) {
         const Bytes16 grey = Load16(img->pData + p);
         const Bytes16 finger = Equal16(Load16(img->pType + p), one);
@@ -84,22 +94,6 @@ void StretchPixels(const GreySpan& span, uint32_t scale, NaviFrame_t* img) {
 }
 
 }  // namespace
-
-int64_t SumBytes(const uint8_t* values, int32_t count) {
-    constexpr int32_t kRun = 1 << 20;  // 255 * 2^20 < 2^31
-    int64_t sum = 0;
-    int32_t i = 0;
-    while (count - i >= kLanes) {
-        const int32_t end = i + std::min(count - i, kRun) / kLanes * kLanes;
-        Sums sums = NoSums();
-        for (; i < end; i += kLanes)
-            sums = AddBytes(sums, Load16(values + i));
-        sum += Total(sums);
-    }
-    for (; i < count; ++i)
-        sum += values[i];
-    return sum;
-}
 
 void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t cutOff, int32_t (&hist)[kGreyLevels]) {
     const int32_t cnt = img->width * img->height - TakeOutBackground(*img, hist);

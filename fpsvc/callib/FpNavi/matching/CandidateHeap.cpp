@@ -8,8 +8,9 @@
 namespace fpnavi {
 namespace {
 
-// Offers the placements of a row of template k. Only those that could be kept get a key: the root
-// is the worst key kept, and it only becomes better.
+// Offers the placements of a row of template k to the heap keys [in, out], num of them. The root is
+// the worst key kept and only becomes smaller, so placements whose difference is above the root's
+// get no key. Reads up to 15 bytes behind the row.
 void OfferRow(const PlacementTable& table, int32_t row, int32_t k, uint32_t* keys, int32_t num) {
     const uint8_t* const diff = table.diff + row * table.columns;
     for (int32_t c = 0; c < table.columns; c += kLanes) {

@@ -1,5 +1,5 @@
 // The candidates of a search in the order of a bounded max-heap: of two that match equally well the
-// earlier one in this order wins. Owns nothing.
+// one that comes earlier in the heap's array wins. Owns nothing.
 #ifndef FPNAVI_CANDIDATEHEAP_H
 #define FPNAVI_CANDIDATEHEAP_H
 
@@ -9,13 +9,13 @@
 
 namespace fpnavi {
 
-// Sift-down of arr[i] in a max-heap of len keys, the caller's. Ties: a parent stays above an equal
-// child, and the left child is preferred to an equal right one. Returns 0 (also for i >= len), or
-// -1 for a null arr or len < 1.
+// Sift-down of arr[i] in arr [in, out], a max-heap of len keys, the caller's. Ties: a parent stays
+// above an equal child, and the left child is preferred to an equal right one. Returns 0 (also for
+// i >= len), or -1 for a null arr or len < 1.
 int32_t MaxHeapify(uint32_t* arr, int32_t len, int32_t i);
 
-// Fills keys [out], num of them, with the best keys of all placements as a heap: they are offered
-// template by template, row by row. Sentinels stay where there are fewer placements.
+// Fills keys [out], num of them, with the best keys of all placements as a max-heap. Placements are
+// offered template by template, row by row. Sentinels stay where there are fewer than num.
 void RankCandidates(const PlacementTables& tables, uint32_t* keys, int32_t num);
 
 }  // namespace fpnavi

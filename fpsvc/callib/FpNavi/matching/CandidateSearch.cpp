@@ -1,8 +1,11 @@
-// Requirement: the displacements of the num smallest keys of all placements.
-// Observation: a key is ordered by difference, row, column and template. With rows outside, columns
-// inside and templates innermost, placements of equal difference come in ascending order of keys.
-// Algorithm: count the placements by difference, which gives the worst difference that is kept and
-// how many placements of it are wanted; then take all better ones, and the first of these.
+// Requirement: the displacements of the num smallest keys of all placements, in any order.
+//
+// Observation: keys are ordered by difference, row, column and template. In loops over rows, then
+// columns, then templates, placements of equal difference come in ascending order of their keys.
+//
+// Algorithm: count the placements by difference. That gives the worst difference that is kept and
+// how many placements of it are wanted. Then one pass takes all better placements, and of that
+// difference as many as are wanted, the first ones.
 #include "matching/CandidateSearch.h"
 
 #include <algorithm>
@@ -17,10 +20,10 @@
 namespace fpnavi {
 namespace {
 
-// What is kept of the placements.
+// Which placements are kept: all below worst, and the first wanted ones of worst.
 struct Cut {
-    int32_t worst;   // difference of the worst placement that is kept
-    int32_t wanted;  // placements of exactly that difference
+    int32_t worst;   // grey difference
+    int32_t wanted;  // placements
 };
 
 Cut CutDifferences(const PlacementTables& tables, int32_t num) {
@@ -39,7 +42,7 @@ struct Placed {
     Displacement origin;
 };
 
-// Takes what is kept, in ascending order of rows, columns and templates.
+// Takes the placements that are kept, in ascending order of rows, columns and templates.
 class Selection {
   public:
     Selection(const TemplateSet& set, const PlacementTables& tables, const Candidates& candidates)
@@ -66,7 +69,8 @@ class Selection {
     }
 
   private:
-    // Takes from 64 columns of a row. kept: a bit for each placement that differs by at most worst.
+    // Takes from 64 columns of a row. Bit c of kept[t]: column + c of template t differs by at most
+    // worst.
     void TakeRow(int32_t row, int32_t column) {
         uint64_t kept[kTpltMax];
         uint64_t any = 0;
@@ -76,7 +80,7 @@ class Selection {
         }
         for (; any != 0; any &= any - 1) {
             const int32_t bit = __builtin_ctzll(any);
-            // Mostly one template has the bit: a branch for each would be mispredicted.
+            // Mostly one template has the bit; a branch for each template would be mispredicted.
             uint32_t having = 0;
             for (int32_t t = 0; t < m_count; ++t)
                 having |= static_cast<uint32_t>(kept[t] >> bit & 1U) << t;
@@ -105,7 +109,7 @@ class Selection {
                          {WrapAdd(placed.origin.di, row), WrapAdd(placed.origin.dj, column)});
     }
 
-    // The best placement mostly matches best, and then the others stop early.
+    // The best placement mostly matches best, and then the scores of the others stop early.
     void PutBestFirst() {
         while (m_taken < m_candidates.num)
             m_candidates.Set(m_taken++, m_sentinel);

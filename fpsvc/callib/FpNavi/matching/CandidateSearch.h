@@ -10,7 +10,7 @@
 
 namespace fpnavi {
 
-// Candidate displacements of num placements: rows di, columns dj.
+// Candidate displacements of num placements: rows di, columns dj. Both arrays are the caller's.
 struct Candidates {
     int32_t* di;
     int32_t* dj;
@@ -29,7 +29,8 @@ struct Candidates {
 void SelectCandidates(const TemplateSet& set, const PlacementTables& tables,
                       const Candidates& candidates);
 
-// Fills candidates [out] with the displacements of keys, in their order.
+// Fills candidates [out] with the displacements of keys [in], candidates.num of them, in their
+// order.
 void ConvertKeys(const TemplateSet& set, const uint32_t* keys, const Candidates& candidates);
 
 // Fills both arrays [out] (s_candidateNum entries, the caller's) with the displacements, rows and

@@ -2,20 +2,26 @@
 
 #include <algorithm>
 
+#include "param/NaviLimits.h"
+
 namespace fpnavi {
 namespace {
 
-// Without gaps the bands are one.
+// Cuts an axis into bands. Without tiles or without gaps there is one band.
 TileAxis CutAxis(int32_t side, int32_t bound, int32_t center, int32_t gap, bool tiled) {
     if (!tiled)
         return {{{0, side}, {0, 0}, {0, 0}}, 1, 0, side};
-    const bool fits = bound >= 0 && center >= 0 && gap >= 0 && side - bound - bound == center;
+    const int64_t fullSide = side + 2 * int64_t{gap};
+    const bool fits = bound >= 0 && center >= 0 && gap >= 0 && fullSide <= kSideMax &&
+                      side - 2 * int64_t{bound} == center;
     if (!fits)
         return {{}, 0, 0, 0};
     if (gap == 0)
         return {{{0, side}, {0, 0}, {0, 0}}, 1, 0, side};
-    return {
-        {{0, bound}, {bound, side - bound}, {side - bound, side}}, kBandMax, gap, side + 2 * gap};
+    return {{{0, bound}, {bound, side - bound}, {side - bound, side}},
+            kBandMax,
+            gap,
+            static_cast<int32_t>(fullSide)};
 }
 
 Meeting MeetStep(const TileAxis& axis, int32_t displacement, int32_t step) {
@@ -25,8 +31,8 @@ Meeting MeetStep(const TileAxis& axis, int32_t displacement, int32_t step) {
     return meeting;
 }
 
-// Calls add with the meeting of each step at which some places meet. Only offsets above 0 reach a
-// band further on, and only those below 0 one before.
+// Calls add with the meeting of each step at which some places meet. Step n needs an offset > 0 to
+// reach a later band, step -n an offset < 0 to reach an earlier one: |displacement| > n * gap.
 template <typename Add>
 void MeetAlong(const TileAxis& axis, int32_t displacement, Add add) {
     if (displacement >= axis.fullSide || displacement <= -axis.fullSide)
@@ -101,7 +107,8 @@ int32_t DisplacementScore::At(const Displacement& displacement, int32_t most) {
         MeetRows(m_rowAxis, displacement.di, &m_rows);
     const RowMeetings& rows = m_rows;
     const ColumnMeetings& columns = ColumnsAt(displacement.dj);
-    // score <= most means sum < (most + 1) * area; the area is not above any of these.
+    // score <= most means sum < (most + 1) * area; the area is at most each of these. places *
+    // places <= 2^24.
     const int32_t mostArea = std::min({rows.places * columns.places, m_first.area, m_second.area});
     if (mostArea < 1 || mostArea <= m_overlapAreaMin)
         return kDiffWorst;

@@ -1,12 +1,15 @@
-// Compares two frames at a displacement of their full images without reading these: the nine tiles
-// of one meet the tiles of the other, each pair of them at an offset of its own. Owns nothing.
+// Compares two frames at a displacement of their full images without reading the full images: the
+// nine tiles of one frame meet those of the other, each pair of tiles at its own offset. Owns
+// nothing.
 //
 // Requirement: the mean grey difference of two full images, one displaced against the other.
-// Observation: a tile is displaced within the full image by a gap for each tile before it. So a
-// pixel of band b of one axis that meets band b + step of the other frame lies there, within the
-// frame, displacement - step * gap further on.
-// Algorithm: along each axis, list the places that meet for each step; each pair of a step of the
-// rows and a step of the columns is a pairing of the two frames.
+//
+// Observation: on one axis a full image has a gap between two bands. Place p of band b that meets
+// band b + step of the other frame meets p + offset there, in coordinates of the frame without
+// gaps: offset = displacement - step * gap.
+//
+// Algorithm: along each axis, list the places that meet for each step. Each step of the rows with
+// each step of the columns is one pairing of the two frames.
 #ifndef FPNAVI_DISPLACEMENTSCORE_H
 #define FPNAVI_DISPLACEMENTSCORE_H
 
@@ -27,16 +30,16 @@ struct TileAxis {
     int32_t fullSide;  // of the full image
 };
 
-// What meets along the rows at a displacement, a meeting for each step at which anything does: a
-// displacement leads to bands further on or to bands before, so that there are at most three steps.
+// What meets along the rows at a displacement: one meeting for each step at which any place does.
+// Steps have the sign of the displacement, so there are at most three: 0, 1, 2 or 0, -1, -2.
 struct RowMeetings {
     int32_t displacement;
-    int32_t places;  // in all steps
+    int32_t places;  // in all steps, at most the side: a place meets one band only
     int32_t count;
     Meeting steps[kBandMax];
 };
 
-// The same along the columns. A slot holds what the last displacement that came to it needed.
+// The same along the columns, kept in a slot of a table: the last displacement that hashed to it.
 struct ColumnMeetings {
     int32_t displacement;
     int32_t places;
@@ -49,14 +52,14 @@ inline constexpr int32_t kColumnSlots = 32;  // of a search; candidates often sh
 // Scores displacements of a pair of frames, one after the other.
 class DisplacementScore {
   public:
-    // slots [out]: count of them, a power of two, the caller's.
+    // slots [out]: count of them, a power of two, the caller's; used by all calls of At.
     DisplacementScore(const SearchParams& params, const FramePair& pair, ColumnMeetings* slots,
                       int32_t count);
 
     // Mean grey difference over the finger area that both frames have in common when pixel
-    // (row, column) of pair.Cut() meets (row + di, column + dj) of pair.Searched(), counted in the
-    // full images when there are such; kDiffWorst when there is too little. A result above most
-    // says only that the score is above it.
+    // (row, column) of pair.Cut() meets (row + di, column + dj) of pair.Searched(), in coordinates
+    // of the full images when the frames are tiled; kDiffWorst when there is too little common
+    // area. A result above most says only that the score is above most.
     int32_t At(const Displacement& displacement, int32_t most);
 
   private:

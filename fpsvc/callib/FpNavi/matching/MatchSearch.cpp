@@ -1,7 +1,12 @@
-// FindCandidate keeps its candidates in a heap, and of two that match equally well the earlier one
-// in the heap's array wins. Keeping the heap costs more than all else, and the order seldom
-// matters: so the same candidates are selected without order, and only when two different
-// displacements share the best score the heap is built and read.
+// Requirement: the match that FindCandidate and FindMatch give one after the other. FindCandidate
+// keeps the candidates in a heap, and of two that match equally well the one that comes earlier in
+// the heap's array wins.
+//
+// Observation: to keep the heap takes longer than all other steps of the search, and the order
+// matters only when two different displacements share the best score.
+//
+// Algorithm: select the same candidates without order and score each different displacement once.
+// Only on a tie build the heap, and take its first key that has one of the best displacements.
 #include "matching/MatchSearch.h"
 
 #include <algorithm>
@@ -14,15 +19,16 @@
 namespace fpnavi {
 namespace {
 
-// Which displacements have been scored: several templates propose the same. A slot remembers one
-// candidate, so that some are scored again, which changes nothing.
+// Which displacements have been scored: several templates propose the same one. A slot holds one
+// candidate; two displacements of one slot may be scored again, which does not change the result.
 class Scored {
   public:
     explicit Scored(const Candidates& candidates) : m_candidates(candidates) {
         std::fill_n(m_candidate, kSlots, -1);
     }
 
-    // Whether the displacement of candidate m has been scored before; it counts as such then.
+    // Returns whether the displacement of candidate m has been scored before, and marks it as
+    // scored.
     bool TestAndSet(int32_t m) {
         const Displacement displacement = m_candidates.At(m);
         const int32_t hash = WrapAdd(WrapMul(displacement.di, kPrime), displacement.dj);
@@ -46,7 +52,7 @@ struct Best {
     int32_t count;
 };
 
-// Moves the displacements with the best score to the front.
+// Moves the displacements with the best score to the front of candidates [in, out].
 Best ScoreAll(const Candidates& candidates, DisplacementScore* score) {
     Scored scored(candidates);
     Best best = {kDiffWorst + 1, 0};
@@ -65,7 +71,7 @@ Best ScoreAll(const Candidates& candidates, DisplacementScore* score) {
     return best;
 }
 
-constexpr int32_t kFew = 16;  // displacements that are sought one by one
+constexpr int32_t kFew = 16;  // best displacements up to which a key is compared with each
 
 // The first key that has one of the best displacements.
 uint32_t FirstBest(const TemplateSet& set, const uint32_t* keys, const Candidates& candidates,
@@ -80,7 +86,7 @@ uint32_t FirstBest(const TemplateSet& set, const uint32_t* keys, const Candidate
         }
         return false;
     };
-    // Some candidate matches best: when no other does, it is the last one.
+    // Some key has a best displacement: when no other key has one, it is the last.
     return *std::find_if(keys, keys + candidates.num - 1, isBest);
 }
 
@@ -99,7 +105,8 @@ Match SearchMatch(const SearchParams& params, const TemplateSet& set, const Fram
     return {DisplacementOf(set, key), best.diff};
 }
 
-// Rows count downwards, dy upwards; the match goes from the frame that the templates were cut from.
+// Rows count downwards, dy upwards. A displacement leads from the frame that the templates were cut
+// from to the other one: its sign is changed when that is the current frame.
 Move MoveOf(const Displacement& displacement, const FramePair& pair) {
     const int32_t sign = pair.cutFromPrev ? -1 : 1;
     return {WrapMul(-sign, displacement.dj), WrapMul(sign, displacement.di)};

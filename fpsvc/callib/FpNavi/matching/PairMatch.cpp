@@ -14,7 +14,7 @@
 namespace fpnavi {
 namespace {
 
-// The key of a pair that has moved so far, in pixels, by a match of score diff.
+// The verdict on a pair whose match of score diff has moved by move, in pixels.
 int32_t JudgeMatch(const Move& move, int32_t diff) {
     if (diff > s_diffThresholdStr)
         return VKEY_NONE;
@@ -43,7 +43,7 @@ bool BuildFullImages() {
            GetFullImg(&s_imageCurr, &s_fullImageCurr) == 0;
 }
 
-// The candidate search and the match, in candidates of the caller's.
+// The candidate search and the match. candidates: scratch, the caller's. match [out].
 bool JoinImages(const FramePair& pair, const Candidates& candidates, Match* match) {
     const SearchParams params = CurrentSearchParams();
     TemplateSet set;

@@ -1,3 +1,12 @@
+// Requirement: the mean grey difference of every valid template at each of its placements.
+//
+// Observation: templates of one size are placed at the same corners, so they can share the strips
+// of the searched frame.
+//
+// Algorithm: for the wide templates, then for the tall ones, in blocks of 16 x 16 placements and
+// piece by piece: cut the strips once, then score the piece of each template of that size. Means of
+// a template of one piece are stored at once; sums of several pieces are added up before the
+// division.
 #include "matching/PlacementScores.h"
 
 #include <algorithm>
@@ -7,14 +16,15 @@
 namespace fpnavi {
 namespace {
 
-constexpr int32_t kAlike = 4;  // templates of one size, which share the strips
+constexpr int32_t kAlike = 4;  // templates of one size
 
 // The wide templates, then the tall ones.
 constexpr int32_t kGroups[kTpltMax / kAlike][kAlike] = {{0, 1, 4, 5}, {2, 3, 6, 7}};
 
-// Divides sums of as many greys as a template of more than one piece has pixels, at most 2^24: the
-// reciprocal in 1/2^56, rounded up, is too large by less than 255 * 2^24 / 2^56 < 1 / 2^24 of a
-// sum.
+// Divides sums of pixels greys by their number, at most 2^24. With the reciprocal in units of
+// 1/2^56, rounded up, the product exceeds the quotient by less than 255 * 2^24 / 2^56 < 1 / 2^24 <=
+// 1 / pixels: the truncated quotient is exact. The product is below 255 * 2^56 + 2^32 <
+// 2^64.
 struct MeanOf {
     explicit MeanOf(int32_t pixels)
         : reciprocal(((uint64_t{1} << 56) - 1) / static_cast<uint64_t>(pixels) + 1) {}
@@ -26,7 +36,7 @@ int32_t CountOf(int64_t first, int64_t last) {
     return static_cast<int32_t>(last - first + 1);
 }
 
-// The table of template k without its memory.
+// The table of template k, not yet in memory: diff is null.
 PlacementTable PlanTable(const SearchParams& params, const TemplateSet& set, int32_t k) {
     const Placements where = PlacementsOf(params, set.tplts[k]);
     if (!set.valid[k] || where.Empty())
@@ -128,7 +138,7 @@ void ScoreGroup(const TemplateSet& set, const PlacementTables& tables, const Ali
     }
 }
 
-// Bytes up to a multiple of sixteen.
+// bytes rounded up to a multiple of sixteen, the alignment of all parts of the memory.
 size_t Padded(size_t bytes) {
     return (bytes + kLanes - 1) / kLanes * kLanes;
 }
@@ -144,7 +154,7 @@ int32_t PlacementTables::Count() const {
 
 SearchMemory PlanMemory(const SearchParams& params, const TemplateSet& set, uint8_t* block) {
     int32_t scores = 0;
-    int32_t pieces = 0;  // of a template that has most
+    int32_t pieces = 0;  // most of any template
     for (int32_t k = 0; k < kTpltMax; ++k) {
         const PlacementTable table = PlanTable(params, set, k);
         scores += table.Count();

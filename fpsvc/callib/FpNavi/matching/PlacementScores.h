@@ -22,18 +22,20 @@ struct PlacementTable {
     int32_t Count() const { return rows * columns; }
 };
 
-// The memory of one candidate search.
+// The memory of one search, cut from one block of bytes bytes. All is scratch: each part is written
+// before it is read.
 struct SearchMemory {
     uint32_t* keys;           // one for each candidate
-    uint8_t* packed;          // the templates' pieces
+    uint8_t* packed;          // the pieces of four templates of one size, kPiecePixels each
     uint8_t* strips;          // of the searched frame
-    uint32_t* sums;           // of placements of templates of more than one piece
+    uint32_t* sums;           // of a block's placements, for templates of more than one piece
     ColumnMeetings* columns;  // of the match, kColumnSlots
-    uint8_t* scores;          // all tables, and 15 bytes that a step of sixteen may read
+    uint8_t* scores;          // all tables, and 16 bytes: a step of sixteen may read 15 of them
     size_t bytes;             // of all
 };
 
-// Plans the memory of a search. Without a block only the number of bytes is meant.
+// Cuts the memory of a search from block, the caller's, aligned to 16. With a null block only the
+// member bytes of the result is of use: the size to allocate.
 SearchMemory PlanMemory(const SearchParams& params, const TemplateSet& set, uint8_t* block);
 
 struct PlacementTables {
@@ -41,7 +43,8 @@ struct PlacementTables {
     int32_t Count() const;  // placements of all templates
 };
 
-// Scores all placements of the valid templates of set in pair.Searched().
+// Scores all placements of the valid templates of set in pair.Searched(). The tables of the result
+// lie in memory.scores; packed, strips and sums of memory are overwritten.
 PlacementTables ScorePlacements(const SearchParams& params, const TemplateSet& set,
                                 const FramePair& pair, const SearchMemory& memory);
 

@@ -9,7 +9,7 @@ namespace {
 constexpr int32_t kSteps = kPiecePixels / kLanes;
 constexpr int32_t kTogether = 4;  // neighbouring placements
 
-// A piece as it is compared: steps of sixteen pixels, and a rest.
+// A piece as it is compared: full steps of sixteen pixels, and one step of what remains.
 struct LoadedPiece {
     Bytes16 bytes[kSteps];
     Bytes16 rest;  // 255 for the pixels of the last step that belong to the piece
@@ -23,7 +23,8 @@ LoadedPiece LoadPiece(const uint8_t* packed, int32_t pixels) {
     return piece;
 }
 
-// Sum of the differences between a piece of full steps and a rest and the placement at patch.
+// Sum of the differences between a piece, kFullSteps full steps and one masked step if there are
+// fewer than kSteps, and the placement at patch [in], which is read in steps of sixteen.
 template <int32_t kFullSteps>
 Sums PatchDifference(const uint8_t* patch, const LoadedPiece& piece) {
     Sums sums = NoSums();
@@ -44,8 +45,8 @@ template <int32_t kFullSteps>
                   PatchDifference<kFullSteps>(patch + 3 * kStripBytes, piece));
 }
 
-// Where the sums of four neighbouring placements go, of which the last group of a row may have
-// less: their means to the table,
+// Two ways to store the sums of four neighbouring placements; the last group of a row may have
+// fewer. This one stores their means in the table.
 struct MeanStore {
     uint8_t* means;
     int32_t tableColumns;
@@ -61,7 +62,7 @@ struct MeanStore {
     }
 };
 
-// or themselves to be added up over the pieces of a template.
+// This one adds the sums up over the pieces of a template.
 struct SumStore {
     uint32_t* sums;
     bool first;
@@ -78,7 +79,8 @@ struct SumStore {
     }
 };
 
-// What a store may write aliases nothing that the loops read: all of it is passed by value.
+// Arguments by value and a local copy of the piece: stores of bytes may alias anything that is
+// reached by reference, which would then be loaded again for each placement.
 template <int32_t kFullSteps, typename Store>
 void ScoreRows(PlacementBlock block, int32_t stripWidth, const LoadedPiece& piece,
                const uint8_t* strips, Store store) {
@@ -127,7 +129,7 @@ void CutStrips(const LaidFrame& frame, const PlacementBlock& block, const Piece&
     for (int32_t c = 0; c < block.columns; ++c) {
         const uint8_t* from = corner + c;
         uint8_t* to = strips + c * kStripBytes;
-        // What a step copies too much is overwritten by the next row.
+        // Bytes beyond the end of a row are overwritten by the next row.
         int32_t r = 0;
         for (; r + 2 <= rows; r += 2, from += 2 * frame.width, to += 2 * piece.columns) {
             Store16(to, Load16(from));

@@ -2,12 +2,14 @@
 // piece at neighbouring placements. Owns nothing.
 //
 // Requirement: the sum of the grey differences of a template at each of its placements.
-// Observation: a strip is as wide as a piece and runs down one column of the searched frame; its
-// rows follow each other without gaps. So the pixels of every placement in it are consecutive
-// bytes, as those of the piece are.
-// Algorithm: the strips of sixteen columns of placements are cut first, and scored then: a store
-// that is read back at once in other steps would have to reach memory first. Four neighbouring
-// placements are summed up in turn, which shares the last steps of their sums.
+//
+// Observation: a strip is a copy of the searched frame as wide as a piece, its rows one behind the
+// other without gaps. The pixels of every placement of the piece in it are consecutive bytes, as
+// those of the packed piece are.
+//
+// Algorithm: cut the strips of a block of placements, one for each of its columns, then score all
+// placements of the block. In one loop, loads of other widths would wait for the stores just before
+// them. Four neighbouring placements are scored together and share the horizontal additions.
 #ifndef FPNAVI_TEMPLATEPIECES_H
 #define FPNAVI_TEMPLATEPIECES_H
 
@@ -23,8 +25,9 @@ inline constexpr int32_t kPieceWidth = kLanes;
 inline constexpr int32_t kBlockRows = 16;     // placements that are scored together
 inline constexpr int32_t kBlockColumns = 16;  // likewise
 
-// A strip of w columns for a piece of h rows has (kBlockRows + h - 1) * w <= 15 * 16 + 64 bytes. A
-// store of sixteen bytes starts in it; so does a patch, of 64 bytes.
+// A strip of w columns for a piece of h rows has (kBlockRows + h - 1) * w <= 15 * 16 + 64 bytes.
+// The last store of sixteen bytes starts in it, and a patch of at most 64 bytes at 15 * w or
+// before: 64 bytes more suffice for both.
 inline constexpr int32_t kStripBytes = 15 * kPieceWidth + 2 * kPiecePixels;
 inline constexpr int32_t kStripsBytes = kBlockColumns * kStripBytes;
 
@@ -55,8 +58,8 @@ int32_t ForEachPiece(int32_t width, int32_t height, Visit visit) {
 // Number of pieces of a template.
 int32_t PieceCount(const Template& tplt);
 
-// Writes the pixels of a piece of tplt one behind the other, filled up with zeroes to kPiecePixels
-// bytes.
+// Writes the pixels of a piece of tplt in frame one behind the other to packed [out], kPiecePixels
+// bytes, of which those behind the piece become 0.
 void PackPiece(const LaidFrame& frame, const Template& tplt, const Piece& piece, uint8_t* packed);
 
 // A block of placements: those of rows x columns corners from (i, j) on, at most kBlockRows x
@@ -68,11 +71,14 @@ struct PlacementBlock {
     int32_t columns;
 };
 
-// Cuts the strips of a block for a piece, kStripBytes apart.
+// Cuts the strips of a block for a piece to strips [out], kStripsBytes bytes of the caller's: one
+// strip for each column of the block, kStripBytes apart. frame: the searched one, of which up to 15
+// bytes behind the pixels are read.
 void CutStrips(const LaidFrame& frame, const PlacementBlock& block, const Piece& piece,
                uint8_t* strips);
 
-// Means of one template's placements, or the sums of a piece to be added up.
+// Where the scores of a block go: the means of a template of one piece, or the sums of a piece to
+// be added up. Arrays are the caller's.
 struct ScoreTarget {
     uint8_t* means;  // of the block's first placement, in a table of tableColumns; or null
     uint32_t* sums;  // else: kBlockColumns for each row of the block
@@ -81,12 +87,14 @@ struct ScoreTarget {
     uint32_t reciprocal;  // of the template's pixels, for means
 };
 
-// 1 / pixels in 1/2^20, rounded up, for 1 <= pixels <= 64: times a sum of as many greys it is too
-// large by less than 64 * 255 / 2^20 < 1 / 64, so that no quotient is.
+// 1 / pixels in units of 1/2^20, rounded up, for 1 <= pixels <= 64. Times a sum of as many greys,
+// at most 64 * 255, it exceeds the quotient by less than 64 * 255 / 2^20 < 1 / 64 <= 1 / pixels:
+// the truncated quotient is exact. The product is at most 255 * (2^20 + 64) < 2^32.
 inline constexpr int32_t kReciprocalBits = 20;
 uint32_t ReciprocalOf(int32_t pixels);
 
-// Scores a piece, packed, at all placements of a block.
+// Scores a piece at all placements of a block. packed [in]: of PackPiece; strips [in]: of CutStrips
+// for this block and piece.
 void ScorePiece(const PlacementBlock& block, const Piece& piece, const uint8_t* packed,
                 const uint8_t* strips, const ScoreTarget& target);
 

@@ -12,8 +12,8 @@ namespace {
 constexpr int32_t kKeyFieldMax = 255;     // rows and columns have 8 bits in a key
 constexpr int32_t kTpltCoverageMin = 49;  // percent of a template that must be exceeded
 
-// Templates 0 to 3 lie at the top, bottom, right and left inside the centre region, 4 to 7 just
-// outside it, in the border tiles, and carry the gap between.
+// Templates 0 to 3 lie at the top, bottom, right and left inside the centre region, 4 to 7 next to
+// them outside, in the border tiles; di and dj count the gaps before each.
 void PlaceTemplates(const SearchParams& p, Template (&tplts)[kTpltMax]) {
     const int32_t wUD = p.tpltWidthUD;
     const int32_t hUD = p.tpltHeightUD;
@@ -35,12 +35,12 @@ void PlaceTemplates(const SearchParams& p, Template (&tplts)[kTpltMax]) {
     tplts[7] = {wLR, hLR, midLR, WrapSub(p.boundWidth, wLR), gh, 0};
 }
 
-// No pixels; one of the sides may be huge all the same.
+// No pixels; the other side may be huge.
 bool IsEmpty(const Template& tplt) {
     return tplt.width < 1 || tplt.height < 1;
 }
 
-// The rectangle at (i0, j0) has no pixel, or all of them lie in the frame.
+// A rectangle of the template's size at (i0, j0) has no pixel, or all of them lie in the frame.
 bool InsideFrame(const SearchParams& params, int64_t i0, int64_t j0, const Template& tplt) {
     if (IsEmpty(tplt))
         return true;
@@ -49,7 +49,7 @@ bool InsideFrame(const SearchParams& params, int64_t i0, int64_t j0, const Templ
            j0 <= params.imageWidth - tplt.width;
 }
 
-// At least half of the template lies in the finger area of frame.
+// At least half of the template's pixels are finger in frame.
 bool IsValid(const Template& tplt, const LaidFrame& frame, int32_t tpltSize) {
     if (IsEmpty(tplt))
         return false;

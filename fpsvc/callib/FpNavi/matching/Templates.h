@@ -64,20 +64,23 @@ struct Displacement {
 
 struct TemplateSet {
     Template tplts[kTpltMax];
-    bool valid[kTpltMax];  // at least half of it is finger
+    bool valid[kTpltMax];  // at least half of the template is finger
     int32_t gapHeight;
     int32_t gapWidth;
     int32_t tpltSize;
 };
 
-// Cuts the templates from pair.Cut(). Returns false when the template has no area, the frames are
-// not of the image's size, or a template or a placement of a valid one would leave the frame or its
-// key.
+// Fills set [out] with the templates of pair.Cut(). Returns false when the template has no area,
+// the frames are not of the image's size, a template does not lie in the frame, or a placement of a
+// valid one does not lie in the frame or has a row or column above 255, which its key cannot hold.
 bool CutTemplates(const SearchParams& params, const FramePair& pair, TemplateSet* set);
 
+// Where tplt is placed: such that it lies in the centre region of the searched frame. With unequal
+// borders that region is shifted.
 Placements PlacementsOf(const SearchParams& params, const Template& tplt);
 
-// Key of a placement: difference, row, column, template, from the top byte down. Smaller is better.
+// Key of a placement: difference, row, column and template, each 0..255, from the top byte down.
+// Smaller is better.
 inline constexpr uint32_t kKeySentinel = 0xFF000000U;  // worse than every placement that counts
 inline constexpr int32_t kDiffKept = 254;  // the worst difference that is better than a sentinel
 

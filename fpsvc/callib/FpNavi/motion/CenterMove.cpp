@@ -1,3 +1,10 @@
+// Requirement: number, column sum and row sum of the finger's pixels, exact for every size.
+//
+// Observation: the sum of row * pixels(row) is the sum, over all rows but row 0, of the pixels at
+// or below that row. So row sums need additions only.
+//
+// Algorithm: strips of sixteen columns, each read from the last row upwards; the pixels so far are
+// added up once for each row.
 #include "motion/CenterMove.h"
 
 #include <algorithm>
@@ -12,12 +19,14 @@
 namespace fpnavi {
 namespace {
 
-// |a| carries the displacement: at least the threshold, and at least 1.2 times |b|.
+// The axis of a carries the displacement: a is at least the threshold and at least 1.2 times b.
+// Both are lengths, not negative.
 bool Dominates(int32_t a, int32_t b) {
     return a >= s_singleMoveThreshold && 100 * a >= 120 * b;
 }
 
-// A large change of coverage for the way made: the finger is pressed or lifted, it does not slide.
+// The coverage changes much for the displacement way: the finger is pressed or lifted, it does not
+// slide.
 bool IsDeformation(int32_t dcvr, int32_t way) {
     if (!IsHg() || way == 0)
         return false;
@@ -33,11 +42,9 @@ struct FingerSums {
     int64_t row;
 };
 
-// The sums of sixteen columns from first on, of which the frame has the first count.
-//
-// Row sums need no multiplication: sum(row * pixels(row)) is the sum over all rows but row 0 of the
-// pixels at or below it. Rows are read upwards, and the pixels so far are added up row by row.
-// In 32 bits: at most 16 * 4096 pixels, 2^16 * 15 columns, 2^16 * 2^12 / 2 rows.
+// The sums of sixteen columns from first on, of which the frame has the first count; 1 <= count <=
+// 16. All three fit 32 bits: at most 16 * 4096 = 2^16 pixels, column sums below 2^16 * 15, row sums
+// below 2^16 * 2^12 / 2 = 2^27.
 FingerSums SumStrip(const NaviFrame_t& img, int32_t first, int32_t count) {
     const Bytes16 one = Splat16(1);
     const Bytes16 ones = And16(FirstBytes(count), one);
@@ -66,7 +73,8 @@ FingerSums SumFinger(const NaviFrame_t& img) {
     return sums;
 }
 
-// The place of a pixel is its centre: 100 * place + 50, in hundredths of a pixel.
+// Mean of the pixels' centres, 100 * place + 50 in hundredths of a pixel, by the side: percent of
+// the side.
 int64_t Centre(int64_t placeSum, int64_t count, int32_t side) {
     return (100 * placeSum + 50 * count) / (side * count);
 }
@@ -101,7 +109,7 @@ int32_t CalcCenterMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr,
     const int32_t ax = WrapAbs(dx);
     const int32_t ay = WrapAbs(dy);
     if (std::max(ax, ay) < s_singleMoveThreshold) {
-        // Where the finger fills both frames its centroid cannot move: no statement.
+        // A finger that fills both frames has a centroid that cannot move: no statement.
         const bool visible = img_prev->cvr < s_coverageMaxCt || img_curr->cvr < s_coverageMaxCt;
         *verdict = visible ? VKEY_NO_MOVE : VKEY_NONE;
         return 0;

@@ -1,12 +1,13 @@
-// Requirement: the least mean grey difference of all small shifts, told apart three ways: below the
-// tolerance, not below, or no shift with enough common finger area.
+// Requirement: is the least mean grey difference of all small shifts below the tolerance, is it
+// not, or has no shift enough common finger area?
 //
 // Observation: the least difference itself is not needed. Rest is known with the first shift below
-// the tolerance; and a sum of differences only grows, so a shift is known not to be below as soon
-// as its sum reaches tolerance * area.
+// the tolerance; and a sum of differences only grows, so a shift is not below as soon as its sum
+// reaches tolerance * area.
 //
-// Algorithm: the unshifted frames first, since a resting finger mostly rests there. The area is
-// bounded from above at first, and counted only for shifts whose sum stays below.
+// Algorithm: shift 0 first, since a resting finger mostly matches there. The sum is compared with
+// tolerance * an upper bound of the area; the area is counted only for shifts whose sum stays
+// below.
 #include "motion/FingerNoMove.h"
 
 #include <algorithm>
@@ -21,8 +22,8 @@ namespace {
 constexpr int32_t kMeanNone = 256;  // least mean when no shift counts: above every mean
 constexpr int32_t kRegionMax = 4;   // pairings of one shift
 
-// One axis of the frame: border, centre, border. Borders of more than half the side overlap, and
-// leave no centre; a band that does not lie inside the side is empty.
+// One axis of the frame: border, centre, border. Borders of more than half the side overlap and
+// leave no centre. A border that is negative or longer than the side leaves all three empty.
 struct Bands {
     Span first;
     Span centre;
@@ -37,8 +38,8 @@ Bands CutBands(int32_t side, int32_t bound) {
     return {{0, bound}, {bound, side - bound}, {side - bound, side}};
 }
 
-// Places of the bands that lie in the same band after the shift. A pixel of the previous frame
-// meets that of the current one shift places before it.
+// Places of the bands a, b and c that lie in the same band after the shift: place p of the previous
+// frame meets p - shift of the current one.
 Meeting StayIn(int32_t shift, const Span& a = {0, 0}, const Span& b = {0, 0},
                const Span& c = {0, 0}) {
     Meeting meeting = {-shift, 0, 0, {}};
@@ -48,8 +49,8 @@ Meeting StayIn(int32_t shift, const Span& a = {0, 0}, const Span& b = {0, 0},
 }
 
 // What is compared at one shift: five regions, the centre and four border bands without the
-// corners. Rows of the centre meet in all columns, rows of the borders in those of the centre.
-// Bands that overlap are kept apart: a pixel of both counts twice.
+// corners. Rows of the centre are compared in all columns, rows of the borders in the columns of
+// the centre. Deliberate: bands that overlap are kept apart, so that a pixel of both counts twice.
 struct ShiftedRows {
     Meeting centre;
     Meeting borders[2];
@@ -107,13 +108,13 @@ class ShiftTest {
           m_rows(CutBands(prev.height, limits.boundHeight)),
           m_columns(CutBands(prev.width, limits.boundWidth)) {}
 
-    // Some shift has enough common finger area, as far as shifts were tested.
+    // Some shift tested so far has enough common finger area.
     bool Counted() const { return m_counted; }
 
-    // Tests the shifts within the limits, first none at all, until one is below the tolerance.
-    // Returns whether one is.
+    // Tests the shifts within the limits, shift 0 first, until one is below the tolerance. Returns
+    // whether one is.
     bool TestShifts() {
-        if (m_limits.tolRow < 0 || m_limits.tolCol < 0)  // no shift at all
+        if (m_limits.tolRow < 0 || m_limits.tolCol < 0)  // there is no shift to test
             return false;
         // Beyond the frame's sides no pixel meets another.
         const int32_t drMax = std::min(m_limits.tolRow, m_prev.height);
@@ -148,8 +149,8 @@ class ShiftTest {
         return area;
     }
 
-    // A bound of Area: the pixels of the regions, or the finger area of a frame when no pixel
-    // counts more than twice.
+    // An upper bound of Area: the pixels of the regions, or the smaller finger area of the frames,
+    // twice that where bands overlap.
     int64_t MostArea(const Regions& regions) const {
         int64_t pixels = 0;
         for (int32_t i = 0; i < regions.count; ++i)
@@ -176,8 +177,9 @@ class ShiftTest {
     bool m_counted = false;
 };
 
-// mean < tolerance means sum < tolerance * area: a sum that reaches the product with an area too
-// large is not below. A sum that may wrap is taken in full. area: Area(regions), or kAreaUnknown.
+// mean < tolerance implies sum < tolerance * area <= tolerance * MostArea, so a sum that reaches
+// the latter is not below. A sum that may exceed 2^31 - 1 is taken in full, because its mean is
+// that of the wrapped sum. area: Area(regions), or kAreaUnknown.
 bool ShiftTest::IsBelowTolerance(const Regions& regions, int32_t area) const {
     const int64_t most = MostArea(regions);
     const bool mayWrap = most * kGreyMax > std::numeric_limits<int32_t>::max();

@@ -22,7 +22,7 @@ struct NoMoveLimits {
     int32_t tolRow;          // largest shift, rows
     int32_t tolCol;          // largest shift, columns
     int32_t overlapAreaMin;  // pixels that are finger in both frames, for a shift to count
-    int32_t diffTol;         // mean grey difference that means rest when it is below
+    int32_t diffTol;         // mean grey difference below which the finger rests
 };
 
 NoMoveLimits CurrentNoMoveLimits();

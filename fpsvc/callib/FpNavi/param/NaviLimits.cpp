@@ -1,8 +1,8 @@
 // Why these numbers: no sensor of this kind has a side above a few hundred pixels, and 4096 x 4096
-// bytes can still be summed and allocated on a phone. A candidate list of 65536 entries is 600
-// times the default. 2^28 byte comparisons take a phone's core a tenth of a second, about 240 times
-// a default pair: a longer pair would stall the service that waits for the key. Keys of the search
-// hold rows and columns of 8 bits; FindCandidate checks those itself.
+// bytes can still be summed and allocated on a phone. A candidate list of 65536 entries is 655
+// times the default. 2^28 byte comparisons are about 250 times those of a default pair: a longer
+// pair would stall the service that waits for the key. Keys of the search hold rows and columns of
+// 8 bits; CutTemplates checks those itself.
 #include "param/NaviLimits.h"
 
 #include <algorithm>
@@ -14,10 +14,9 @@
 namespace fpnavi {
 namespace {
 
-constexpr int32_t kSideMax = 4096;                  // pixels
 constexpr int32_t kCandidateMax = 65536;            // entries
 constexpr int64_t kPairWorkMax = int64_t{1} << 28;  // byte comparisons
-constexpr int64_t kFactorMax = int64_t{1} << 31;    // bounds products below 2^62
+constexpr int64_t kFactorMax = int64_t{1} << 31;    // bounds products by 2^62
 constexpr int64_t kProductMax = kPairWorkMax + 1;   // anything larger is refused alike
 
 bool SideUsable(int64_t side) {

@@ -4,7 +4,12 @@
 #ifndef FPNAVI_NAVILIMITS_H
 #define FPNAVI_NAVILIMITS_H
 
+#include <cstdint>
+
 namespace fpnavi {
+
+// Longest side of an image or of a full image, pixels.
+inline constexpr int32_t kSideMax = 4096;
 
 // Block sizes and counts are positive. Two negative ones would make a side that looks positive.
 bool BlockFactorsPositive();

@@ -7,7 +7,7 @@
 
 namespace fpnavi {
 
-// Coverage, in percent, of a double-scan map: 64 cells, those exactly 1 count.
+// Coverage, in percent, of a double-scan map [in] of 64 cells, of which those exactly 1 count.
 int32_t DoubleScanFingerDetect(const uint8_t* DoubleScanZone);
 
 }  // namespace fpnavi

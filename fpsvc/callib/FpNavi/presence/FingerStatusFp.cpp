@@ -1,3 +1,9 @@
+// Requirement: a finger is present when any of three signs says so: ridge texture (or a dark
+// block), spread of the block means, grey range of a block.
+//
+// Observation: measuring a sign has no effect besides its value.
+//
+// Algorithm: measure the cheapest sign first, and stop at the first that says finger.
 #include "presence/FingerStatusFp.h"
 
 #include <algorithm>
@@ -14,7 +20,7 @@ namespace {
 constexpr int32_t colNum = 4;
 constexpr int32_t rowNum = 4;
 constexpr int32_t blkNum = colNum * rowNum;
-constexpr int32_t kSpreadNone = -1;  // below every spread of block means
+constexpr int32_t kSpreadNone = -1;  // less than every spread of block means
 
 static_assert(colNum == kBlocksCounted, "a row of blocks is counted at a time");
 
@@ -32,7 +38,7 @@ int32_t GetBlkMeanDiff(const uint8_t* buffer, int32_t* blk_mean_diff) {
     int32_t min = kGreyMax;
     for (int32_t k = 0; k < blkNum; ++k) {
         const int32_t first = k / colNum * blkHeight * s_imageWidth + k % colNum * blkWidth;
-        // At most 1024 x 1024 pixels.
+        // At most 1024 x 1024 = 2^20 pixels, below kMostSummed.
         const int32_t sum = SumBlock(buffer, first, blkWidth, blkHeight, s_imageWidth);
         const int32_t mean = sum / (blkWidth * blkHeight);
         max = std::max(max, mean);
@@ -52,10 +58,11 @@ int32_t GetGreyRange(const uint8_t* buffer, int32_t* range) {
     // lowLimit / 100, and at least the high limit when it is above (highLimit - 1) / 100.
     const int32_t lowLimit = WrapMul(blkSize, s_cutOffPercent);
     const int32_t highLimit = WrapMul(blkSize, WrapSub(100, s_cutOffPercent));
-    // Even the count 0 is beyond such a limit, so nothing crosses it.
+    // A count of 0 already exceeds a negative limit, so nothing crosses it.
     const int32_t lowCount = lowLimit >= 0 ? lowLimit / 100 : kNeverAbove;
     const int32_t highCount = highLimit > 0 ? (highLimit - 1) / 100 : kNeverAbove;
-    // Not reset for each block: one without a crossing is measured by the levels before it.
+    // Deliberate: not reset for each block. A block without a crossing takes the level of the block
+    // before it.
     int32_t iLow = 0;
     int32_t iHigh = 0;
     int32_t max = 0;
@@ -81,8 +88,6 @@ int32_t NavFingerDetectFp(const uint8_t* p_data) {
     // A block that the texture test leaves unwritten has no texture and a white mean.
     int32_t fftRes[2 * blockNum] = {0, 0, 0, 0, 0, 255, 255, 255, 255, 255};
     FingerBLKTest(p_data, s_imageWidth, s_imageHeight, fftRes, 0);
-    // Each sign is a finger by itself, and the measures have no effect but their values: the
-    // dearer ones are taken only when the others decide nothing.
     for (int32_t i = 0; i < blockNum; ++i) {
         if (fftRes[i] >= s_fftResThreshold || fftRes[blockNum + i] < s_meanThresholdFp)
             return 1;

@@ -12,7 +12,8 @@ namespace {
 
 constexpr int32_t kMeanNone = 256;  // above every mean of grey levels
 
-// Sum of the first count bytes of the frame; low 32 bits, as the mean divides no more.
+// Sum of the first count bytes of the frame. Deliberate: its low 32 bits alone, which the mean
+// divides.
 int32_t FrameSum(const uint8_t* p_data, int32_t count) {
     int64_t sum = 0;
     while (count > 0) {

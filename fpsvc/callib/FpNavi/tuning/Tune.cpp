@@ -91,7 +91,8 @@ uint32_t RegisterNow(uint32_t value) {
     return EncodeDc(_NAVI_dc_mode, _NAVI_dc_current, _NAVI_dc_residual, value);
 }
 
-// A frame that cannot be measured gets a mean of 0, and all else stays as the frame before left it.
+// A frame that cannot be measured gets a mean of 0; all other values stay those of the frame
+// before.
 void Measure(const uint8_t* img, uint32_t gainCode) {
     const std::optional<FrameMeasure> measured = MeasureFrame(img, sImgSizeInfo, gainCode);
     if (!measured) {

@@ -1,4 +1,4 @@
-// Tuning, the corner: which corner block of the frame is looked at, how bright it is, and the top
+// Tuning, the corner: which corner block of the frame is measured, how bright it is, and the top
 // grey of its histogram. Owns nothing and reads no state: arguments in, values out.
 #ifndef FPNAVI_TUNEHISTOGRAM_H
 #define FPNAVI_TUNEHISTOGRAM_H
@@ -12,7 +12,7 @@ namespace fpnavi {
 
 // What one corner block shows.
 struct CornerGreys {
-    int32_t mean;                     // sum of its greys by a sixteenth of the image's pixels
+    int32_t mean;                     // sum of its greys / (pixels of the image / 16)
     uint32_t histogram[kGreyLevels];  // pixels of each grey level
 };
 
@@ -25,7 +25,8 @@ bool ImageDividable(int32_t height, int32_t width);
 std::optional<CornerGreys> MeasureCorner(const uint8_t* img, int32_t height, int32_t width,
                                          int32_t rank);
 
-// Sorts len values ascending, and the tags in iIndex along with them.
+// Sorts the len values fValue [in, out] ascending, and the tags iIndex [in, out] in the same way.
+// Not stable: each step swaps the last of the largest values with the last value not yet in place.
 void _NAVI_SortIndex(int32_t* fValue, int32_t* iIndex, int32_t len);
 
 // Mean grey of the pixels ranked between X and Y percent from the brightest, or -1 when the two

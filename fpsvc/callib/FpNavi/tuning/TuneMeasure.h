@@ -28,10 +28,10 @@ struct FrameMeasure {
     CornerGreys corner;  // the measured block
 };
 
-// Measures a frame of the given size (its bytes row by row, the caller's) taken at the packed gain
-// code. Empty when it cannot be measured: its size is no multiple of 16, which is logged whatever
-// else is wrong; one of the block sizes and counts is not positive; its pixels do not fit 32 bits;
-// the rank of the block or a gain field lies outside its table.
+// Measures the frame img [in] of the given size (row by row, the caller's), taken at the packed
+// gain code. Empty when it cannot be measured: its pixels are no multiple of 16, which is logged
+// whatever else is wrong; one of the block sizes and counts is not positive; its pixels do not fit
+// 32 bits; the rank of the block or a gain field lies outside its table.
 std::optional<FrameMeasure> MeasureFrame(const uint8_t* img, const _NAVI_SIZE& size,
                                          uint32_t gainCode);
 

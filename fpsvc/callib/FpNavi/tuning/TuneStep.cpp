@@ -1,3 +1,11 @@
+// Requirement: bring the mean grey of the measured block into the effective band in few calls, each
+// of which sees one frame; the DC stays between its lower limit and 255.
+//
+// Observation: the gain factor says how many greys a DC step is worth, so one division sizes the
+// step. That fails on a saturated frame, whose grey does not say how far away the target is.
+//
+// Algorithm: step by distance to the target / gain factor, at least 16 on a saturated frame. When
+// such a frame changes sides from one call to the next, the step overshot: bisect.
 #include "tuning/TuneStep.h"
 
 #include <algorithm>
@@ -9,12 +17,12 @@ namespace fpnavi {
 namespace {
 
 constexpr int32_t kGreyTarget = 180;     // the middle of the recommended bands
-constexpr uint32_t kStepSaturated = 16;  // least step while greys are saturated and tell nothing
+constexpr uint32_t kStepSaturated = 16;  // least step on a saturated frame
 constexpr int32_t kUnknown = 3;          // no recommendation yet
 constexpr uint32_t kByteMask = 0xFF;
 
-// The step that brings grey to the target, at least 1; at the target it stays what it was. A gain
-// factor of 0 tells nothing about the size: 1.
+// The DC step that brings grey to the target, at least 1. Deliberate: at the target it stays what
+// it was before. With a gain factor of 0 the size is unknown: 1.
 uint32_t StepToTarget(int32_t grey, uint32_t gainFactor, uint32_t before) {
     if (grey == kGreyTarget)
         return before;
@@ -34,7 +42,8 @@ uint32_t Lowered(const DcState& dc, int32_t reference) {
                                                         : static_cast<uint32_t>(reference);
 }
 
-// A saturated frame whose recommendation flipped since the last call: the last step overshot.
+// A saturated frame whose recommendation differs from that of the last call: the last step
+// overshot.
 bool Overshot(const DcState& dc, const GreyReading& reading) {
     const bool known = dc.recommendPre != kUnknown && dc.recommendPre != 0;
     const bool dcMoved = (dc.current & kByteMask) != (dc.pre & kByteMask);
@@ -42,7 +51,7 @@ bool Overshot(const DcState& dc, const GreyReading& reading) {
     return known && reading.nonLinear != 0 && dcMoved && flipped;
 }
 
-// The mean of the DC and the one before; next to each other, the one before.
+// Bisect: the mean of current and previous DC, or the previous one when they are neighbours.
 uint32_t Bisected(const DcState& dc) {
     const uint32_t d = WrapSubU(dc.current & kByteMask, dc.pre & kByteMask);
     if (d == 1 || d == WrapSubU(0, 1))

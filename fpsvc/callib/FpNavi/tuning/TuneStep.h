@@ -1,5 +1,5 @@
 // Tuning, the decision: in which direction and how far the DC goes, within its limits. Owns nothing
-// and reads no state: each function makes the state after of the state before and a reading.
+// and reads no state: each function computes the next state from the state before and a reading.
 #ifndef FPNAVI_TUNESTEP_H
 #define FPNAVI_TUNESTEP_H
 
@@ -9,7 +9,7 @@
 
 namespace fpnavi {
 
-// What one call decides of the DC, and the next goes on from.
+// The state of the DC that one call leaves to the next.
 struct DcState {
     uint32_t current;        // the DC that is being tuned
     uint32_t pre;            // DC that was in the sensor at the last call
@@ -29,8 +29,8 @@ DcState SizeStep(const DcState& before, const GreyReading& reading);
 // effective: of the reading.
 DcState ApplyStep(const DcState& before, int32_t effective, int32_t reference);
 
-// The whole decision of a call: no step while the mean is effective; half of the way back after a
-// step that overshot; else SizeStep and ApplyStep. reference: least DC, _NAVI_DC_REF.
+// The decision of a call: no step while the mean is in the effective band; bisection after a step
+// that overshot; else SizeStep and ApplyStep. reference: least DC, _NAVI_DC_REF.
 DcState DecideStep(const DcState& before, const GreyReading& reading, int32_t reference);
 
 }  // namespace fpnavi

@@ -5,8 +5,8 @@
 #include "base/NaviLog.h"
 #include "gesture/NaviVoteInfo.h"
 
-// The lists of single values come with eleven values for ten conversions: what reads the log
-// depends on the ten, so the eleventh stays unprinted.
+// Deliberate: lists of single values are given eleven values for ten conversions. Readers of the
+// log depend on ten, so the eleventh stays unprinted.
 #pragma GCC diagnostic ignored "-Wformat-extra-args"
 
 // A list of eleven entries, one or two values each. Macros, since they are arguments of a printf.

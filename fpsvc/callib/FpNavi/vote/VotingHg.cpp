@@ -36,8 +36,8 @@ bool CountsSuffice(const VerdictCounts& counts) {
            (counts.byKey[VKEY_NO_MOVE] < move_cnt && move_cnt > s_moveCntMinThr);
 }
 
-// A stroke along one axis: the keys of its two senses and of the axis across, and the centroid's
-// first and last place on it.
+// A stroke along one axis: the keys of its two directions and of the axis across, and the first and
+// last place of the centroid on it.
 struct Axis {
     int32_t positive;
     int32_t negative;
@@ -47,7 +47,7 @@ struct Axis {
     int32_t last;
 };
 
-// Pairs speak for vkey: more than for either key across, and none for the opposite.
+// More pairs have the verdict vkey than either key across, and none has the opposite.
 bool CountsFavour(const VerdictCounts& counts, const Axis& axis, int32_t vkey, int32_t opposite) {
     return counts.byKey[vkey] > counts.byKey[axis.across1] &&
            counts.byKey[vkey] > counts.byKey[axis.across2] && counts.byKey[opposite] == 0;
@@ -57,7 +57,7 @@ int32_t VoteAlong(const Axis& axis, const VerdictCounts& counts) {
     const int32_t total = WrapSub(axis.last, axis.first);
     if (WrapAbs(total) < s_totalMoveThreshold)
         return VKEY_NO_MOVE;
-    // A centroid that crossed the middle has moved, whatever single pairs say.
+    // A centroid that crossed the middle has moved, whatever the verdicts of single pairs are.
     if (WrapMul(axis.first, axis.last) < 0)
         return total > 0 ? axis.positive : axis.negative;
     if (CountsFavour(counts, axis, axis.positive, axis.negative))
