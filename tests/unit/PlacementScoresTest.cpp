@@ -10,7 +10,6 @@
 #include "Fixtures.h"
 #include "frame/FramePair.h"
 #include "matching/PlacementScores.h"
-#include "matching/TemplatePieces.h"
 #include "matching/Templates.h"
 
 namespace {
@@ -146,7 +145,7 @@ void ExpectPlan(const SearchParams& params, uint8_t type, int32_t pieces, int32_
     EXPECT_EQ(At(memory.packed, block), at);
     at += pieces * 4 * 64;  // four templates of one size, 64 bytes a piece
     EXPECT_EQ(At(memory.strips, block), at);
-    at += kStripsBytes;
+    at += 16 * (15 * 16 + 2 * 64);  // sixteen strips of a block
     EXPECT_EQ(At(memory.sums, block), at);
     at += pieces > 1 ? 4 * 16 * 16 * 4 : 0;  // of four templates at 16 x 16 placements
     EXPECT_EQ(At(memory.columns, block), at);
