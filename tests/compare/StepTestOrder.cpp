@@ -31,7 +31,7 @@ class Calls {
   public:
     static constexpr int32_t kCount = 7;
 
-    // FindMatch is asked about random displacements, if the frames are matchable.
+    // FindMatch gets random displacements where the two frames can be compared.
     Calls(SimRandom& random, bool matchable) : m_matchable(matchable) {
         for (int32_t n = 0; n < fpnavi::s_candidateNum; ++n) {
             m_di.push_back(random.Range(-8, 8));

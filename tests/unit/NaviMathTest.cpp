@@ -23,12 +23,6 @@ TEST(ClampToGrey, CutsAtBothEnds) {
     EXPECT_EQ(ClampToGrey(kMax), 255);
 }
 
-TEST(GreyDiff, IsSymmetric) {
-    EXPECT_EQ(GreyDiff(0, 255), 255);
-    EXPECT_EQ(GreyDiff(255, 0), 255);
-    EXPECT_EQ(GreyDiff(77, 77), 0);
-}
-
 TEST(WrapArithmetic, KeepsTheLow32Bits) {
     EXPECT_EQ(WrapAdd(kMax, 1), kMin);
     EXPECT_EQ(WrapSub(kMin, 1), kMax);

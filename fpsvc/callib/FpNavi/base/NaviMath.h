@@ -1,4 +1,4 @@
-// Integer helpers of the module: clamping, differences, the named arithmetic that may wrap, and the
+// Integer helpers of the module: clamping, the named arithmetic that may wrap, and the
 // integer square root. Everything else in the module is shown not to overflow. Owns nothing.
 //
 // The Wrap functions compute in 64 bits and keep the low 32, that is two's complement arithmetic.
@@ -13,11 +13,6 @@ inline constexpr int32_t kGreyMax = 255;  // largest 8-bit grey level
 
 inline uint8_t ClampToGrey(int32_t value) {
     return static_cast<uint8_t>(value < 0 ? 0 : (value > kGreyMax ? kGreyMax : value));
-}
-
-// |a - b| of two grey values, 0..255.
-inline int32_t GreyDiff(uint8_t a, uint8_t b) {
-    return a > b ? a - b : b - a;
 }
 
 inline int32_t Wrap(int64_t value) {
