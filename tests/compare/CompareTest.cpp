@@ -80,7 +80,7 @@ void ReplayWithWrittenCounts(uint64_t test, Mode mode, int64_t percent) {
         twin.Clear();
         for (const host::RecordedFrame& frame : gesture.frames) {
             if (random.Chance(40))
-                twin.SetPairCount(counts[random.Below(static_cast<int32_t>(std::size(counts)))]);
+                Twin::SetPairCount(counts[random.Below(static_cast<int32_t>(std::size(counts)))]);
             if (mode == Mode::DoubleScan)
                 twin.Zones(frame.reg24, frame.reg28);
             twin.Block(frame.raw, gesture.geometry.Width());

@@ -15,41 +15,51 @@ namespace {
 using host::Mode;
 using host::SimRandom;
 
+host::ParamBlock RandomTuneParams(SimRandom& random) {
+    const Mode mode = random.Chance(5) ? Mode::Hg : Mode::Fp;
+    host::ParamBlock params =
+        random.Chance(60) ? VariedParams(random, mode) : HostileParams(random, mode);
+    host::ParamValue(params, "iDCMode") = random.Chance(90) ? random.Below(2) : 2;
+    if (random.Chance(20))
+        host::ParamValue(params, "_NAVI_blk_selection_mode") = random.Range(-1, 4);
+    if (random.Chance(30))
+        host::ParamValue(params, "_NAVI_TimeOut_threshold") = random.Range(-1, 6);
+    return params;
+}
+
+// Calls of one run: frames about one grey level, now and then another DC or a cleared gesture.
+void RunCalls(SimRandom& random, Twin* twin) {
+    const uint32_t gainMask = random.Chance(90) ? 0x00070707U : 0xFFFFFFFFU;
+    const uint32_t gain20 = static_cast<uint32_t>(random.Next()) & gainMask;
+    const uint32_t gain2C = static_cast<uint32_t>(random.Next()) & gainMask;
+    const int32_t base = random.Range(0, 255);
+    const int32_t spread = random.Chance(40) ? 2 : random.Range(1, 100);
+    for (int32_t call = 0; call < random.Range(1, 8); ++call) {
+        std::vector<uint8_t> image(size_t{1} << 20);
+        const int32_t level = base + random.Range(-60, 60);
+        std::generate_n(image.begin(), 4096, [&] {
+            return static_cast<uint8_t>(std::clamp(level + random.Range(-spread, spread), 0, 255));
+        });
+        twin->Tune(image, gain20, gain2C);
+        if (random.Chance(10))
+            twin->SetDac(static_cast<uint32_t>(random.Next()));
+        if (random.Chance(10))
+            twin->Clear();
+    }
+}
+
 // Tuning runs with gestures between them.
 TEST(CompareTuning, RunsOfAllModes) {
     Twin& twin = Twin::Get();
     const int64_t count = Gestures(5);
     for (int64_t i = 0; i < count; ++i) {
         SimRandom random(SeedOf(51, i));
-        const Mode mode = random.Chance(5) ? Mode::Hg : Mode::Fp;
-        host::ParamBlock params =
-            random.Chance(60) ? VariedParams(random, mode) : HostileParams(random, mode);
-        host::ParamValue(params, "iDCMode") = random.Chance(90) ? random.Below(2) : 2;
-        if (random.Chance(20))
-            host::ParamValue(params, "_NAVI_blk_selection_mode") = random.Range(-1, 4);
-        if (random.Chance(30))
-            host::ParamValue(params, "_NAVI_TimeOut_threshold") = random.Range(-1, 6);
+        const host::ParamBlock params = RandomTuneParams(random);
         twin.SetParam(&params);
-        if (!twin.ImageFits())
+        if (!Twin::ImageFits())
             continue;
         twin.SetDac(static_cast<uint32_t>(random.Next()));
-        const uint32_t gainMask = random.Chance(90) ? 0x00070707U : 0xFFFFFFFFU;
-        const uint32_t gain20 = static_cast<uint32_t>(random.Next()) & gainMask;
-        const uint32_t gain2C = static_cast<uint32_t>(random.Next()) & gainMask;
-        const int32_t base = random.Range(0, 255);
-        const int32_t spread = random.Chance(40) ? 2 : random.Range(1, 100);
-        for (int32_t call = 0; call < random.Range(1, 8); ++call) {
-            std::vector<uint8_t> image(size_t{1} << 20);
-            const int32_t level = base + random.Range(-60, 60);
-            for (size_t p = 0; p < 4096; ++p)
-                image[p] =
-                    static_cast<uint8_t>(std::clamp(level + random.Range(-spread, spread), 0, 255));
-            twin.Tune(image, gain20, gain2C);
-            if (random.Chance(10))
-                twin.SetDac(static_cast<uint32_t>(random.Next()));
-            if (random.Chance(10))
-                twin.Clear();
-        }
+        RunCalls(random, &twin);
         ASSERT_FALSE(twin.Difference()) << *twin.Difference() << " of run " << i;
     }
 }

@@ -12,7 +12,6 @@
 namespace fpnavi_test {
 namespace {
 
-using host::ParamValue;
 using host::SimRandom;
 
 // A frame whose columns matter, or the same turned, whose rows do.
@@ -26,6 +25,7 @@ struct Turned {
     std::vector<uint8_t> Greys(const std::vector<uint8_t>& along, int32_t other) const {
         const int32_t side = static_cast<int32_t>(along.size());
         std::vector<uint8_t> greys;
+        greys.reserve(along.size() * static_cast<size_t>(other));
         for (int32_t p = 0; p < side * other; ++p)
             greys.push_back(along[static_cast<size_t>(rows ? p / other : p % side)]);
         return greys;

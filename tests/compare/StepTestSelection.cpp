@@ -52,19 +52,28 @@ void LoadFull(const std::vector<uint8_t>& prev, const std::vector<uint8_t>& curr
     LoadPair({prev, FlatBytes(kSize, 1), curr, FlatBytes(kSize, 1)});
 }
 
-// The displacements of the placements of all four templates, by row, column and template.
-Moves AllByKey() {
-    constexpr int32_t kRow[] = {2, 7, 4, 4};
-    constexpr int32_t kColumn[] = {5, 5, 9, 2};
-    Moves moves;
+// Calls visit(row, column, template) for the placements of all four templates in the order of their
+// keys.
+template <typename Visit>
+void ForEachPlacement(Visit visit) {
     for (int32_t row = 2; row < 8; ++row) {
         for (int32_t column = 2; column < 10; ++column) {
             for (size_t k = 0; k < 4; ++k) {
                 if (k < 2 ? column < 9 : row < 7)
-                    moves.emplace_back(row - kRow[k], column - kColumn[k]);
+                    visit(row, column, k);
             }
         }
     }
+}
+
+// Their displacements.
+Moves AllByKey() {
+    constexpr int32_t kRow[] = {2, 7, 4, 4};
+    constexpr int32_t kColumn[] = {5, 5, 9, 2};
+    Moves moves;
+    ForEachPlacement([&](int32_t row, int32_t column, size_t k) {
+        moves.emplace_back(row - kRow[k], column - kColumn[k]);
+    });
     return moves;
 }
 
@@ -103,16 +112,10 @@ TEST(StepSelection, BetterPlacementsComeBeforeTheFirstTies) {
     const Moves all = AllByKey();
     std::vector<std::pair<int32_t, size_t>> ranked;  // difference, place in all
     size_t at = 0;
-    for (int32_t row = 2; row < 8; ++row) {
-        for (int32_t column = 2; column < 10; ++column) {
-            for (size_t k = 0; k < 4; ++k) {
-                if (!(k < 2 ? column < 9 : row < 7))
-                    continue;
-                const int32_t across = k < 2 && column == 5 ? 2 : (column >= 6 ? 4 : 0);
-                ranked.emplace_back(across, at++);
-            }
-        }
-    }
+    ForEachPlacement([&](int32_t /*row*/, int32_t column, size_t k) {
+        const int32_t across = k < 2 && column == 5 ? 2 : (column >= 6 ? 4 : 0);
+        ranked.emplace_back(across, at++);
+    });
     std::sort(ranked.begin(), ranked.end());
     Moves expected;
     for (const auto& [difference, place] : ranked)

@@ -31,7 +31,7 @@ class Twin {
     void SetImage(const std::vector<uint8_t>& image);
     void SetDac(uint32_t value);
     // As a host that writes into the record.
-    void SetPairCount(int32_t calc_cnt);
+    static void SetPairCount(int32_t calc_cnt);
 
     // In the next call of Frame allocation number (the first is 1) fails, alone or with all after.
     void FailAllocation(int32_t number, bool forGood);

@@ -2,6 +2,7 @@
 // writes it back into the register word. The state between calls is here, with the classification
 // of the measured grey levels and the test for completion.
 
+#include <algorithm>
 #include <cstring>
 #include <initializer_list>
 
@@ -114,11 +115,7 @@ void ClassifyMeasurement() {
 
 // Sides are products: with two negative factors one is positive and no buffer has it.
 bool HasNegativeOrNoBlocks() {
-    for (const int32_t factor : {s_blockWidth, s_blockHeight, s_blockColNum, s_blockRowNum}) {
-        if (factor < 1)
-            return true;
-    }
-    return false;
+    return std::min({s_blockWidth, s_blockHeight, s_blockColNum, s_blockRowNum}) < 1;
 }
 
 // A frame of the wrong size fails with its log line before anything else matters. Any other frame
