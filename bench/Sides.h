@@ -14,7 +14,6 @@
 #include "frame/PreProcess.h"
 #include "gesture/NaviVoteInfo.h"
 #include "matching/CandidateSearch.h"
-#include "matching/MatchSearch.h"
 #include "matching/PairMatch.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"

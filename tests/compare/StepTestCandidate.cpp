@@ -6,7 +6,7 @@
 
 #include "StepFrames.h"
 #include "StepTestPair.h"
-#include "matching/CandidateHeap.h"
+#include "matching/CandidateSearch.h"
 
 namespace fpnavi_test {
 namespace {

@@ -12,10 +12,9 @@ from tree import PLAIN, Failure, run
 # Files of the module whose tests are in the test file of another.
 _TESTED_IN = {
     'BiThreshold': 'PreProcess', 'FingerRidge': 'PreProcess', 'StretchRange': 'PreProcess',
-    'FramePair': 'FingerNoMove', 'Templates': 'FindCandidate', 'TemplatePieces': 'FindCandidate',
-    'PlacementScores': 'FindCandidate', 'CandidateHeap': 'FindCandidate',
-    'CandidateSearch': 'FindCandidate', 'DisplacementScore': 'ImgJoint', 'MatchSearch': 'ImgJoint',
-    'PairMatch': 'ImgJoint', 'TuneMeasure': 'Tune', 'TuneRegisters': 'Tune',
+    'FramePair': 'FingerNoMove', 'Templates': 'FindCandidate',
+    'PlacementScores': 'FindCandidate', 'CandidateSearch': 'FindCandidate',
+    'DisplacementScore': 'ImgJoint', 'PairMatch': 'ImgJoint', 'TuneMeasure': 'Tune', 'TuneRegisters': 'Tune',
     'WordLanes': 'FingerDetect', 'SetNaviParam': 'NaviParam', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
     'NaviVoteInfo': 'Gesture', 'NaviMode': 'NaviParam',
 }

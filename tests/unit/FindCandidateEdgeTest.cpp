@@ -6,7 +6,6 @@
 
 #include "Fixtures.h"
 #include "frame/NaviFrame.h"
-#include "matching/CandidateHeap.h"
 #include "matching/CandidateSearch.h"
 #include "param/NaviParam.h"
 

@@ -8,7 +8,6 @@
 #include "FailingMalloc.h"
 #include "Fixtures.h"
 #include "frame/NaviFrame.h"
-#include "matching/CandidateHeap.h"
 #include "matching/CandidateSearch.h"
 #include "param/NaviParam.h"
 

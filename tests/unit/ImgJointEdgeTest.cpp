@@ -7,7 +7,6 @@
 
 #include "Fixtures.h"
 #include "frame/NaviFrame.h"
-#include "matching/MatchSearch.h"
 #include "matching/PairMatch.h"
 
 namespace {

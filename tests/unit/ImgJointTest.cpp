@@ -8,7 +8,6 @@
 #include "Fixtures.h"
 #include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
-#include "matching/MatchSearch.h"
 #include "matching/PairMatch.h"
 #include "param/NaviParam.h"
 

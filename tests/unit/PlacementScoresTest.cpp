@@ -108,6 +108,16 @@ TEST(ScorePlacements, EveryTemplateSizeGivesTheMeans) {
     }
 }
 
+// Pieces of every width, cut off at every row.
+TEST(ScorePlacements, LongTemplatesGiveTheMeans) {
+    for (int32_t width = 1; width <= 17; ++width) {
+        for (const int32_t height : {21, 31, 32, 33, 63, 64, 65, 70}) {
+            CompareScores(ParamsOf(height + 6, height + 5, 2, width, height, false), true);
+            ASSERT_FALSE(HasFailure()) << width << " x " << height;
+        }
+    }
+}
+
 // Placements from one to more than two blocks in either axis.
 TEST(ScorePlacements, EveryNumberOfPlacementsGivesTheMeans) {
     for (const int32_t more : {0, 1, 2, 3, 14, 15, 16, 17, 30, 31, 32, 33}) {
@@ -131,8 +141,8 @@ ptrdiff_t At(const void* part, const std::vector<uint8_t>& block) {
     return static_cast<const uint8_t*>(part) - block.data();
 }
 
-// The parts follow each other, each in steps of 16 bytes. pieces: of the template that has most.
-void ExpectPlan(const SearchParams& params, uint8_t type, int32_t pieces, int32_t placements) {
+// The parts follow each other, each in steps of 16 bytes.
+void ExpectPlan(const SearchParams& params, uint8_t type, int32_t placements) {
     TestFrame frame(params.imageWidth, params.imageHeight, 9, type);
     const FramePair pair = {LayOut(*frame.Get()), LayOut(*frame.Get()), false};
     TemplateSet set;
@@ -142,12 +152,10 @@ void ExpectPlan(const SearchParams& params, uint8_t type, int32_t pieces, int32_
     ptrdiff_t at = 0;
     EXPECT_EQ(At(memory.keys, block), at);
     at += (4 * params.candidateNum + 15) / 16 * 16;
-    EXPECT_EQ(At(memory.packed, block), at);
-    at += pieces * 4 * 64;  // four templates of one size, 64 bytes a piece
     EXPECT_EQ(At(memory.strips, block), at);
     at += 16 * (15 * 16 + 2 * 64);  // sixteen strips of a block
     EXPECT_EQ(At(memory.sums, block), at);
-    at += pieces > 1 ? 4 * 16 * 16 * 4 : 0;  // of four templates at 16 x 16 placements
+    at += 4 * 16 * 16 * 4;  // of four templates at 16 x 16 placements
     EXPECT_EQ(At(memory.columns, block), at);
     at += (kColumnSlots * static_cast<ptrdiff_t>(sizeof(ColumnMeetings)) + 15) / 16 * 16;
     EXPECT_EQ(At(memory.scores, block), at);
@@ -156,19 +164,18 @@ void ExpectPlan(const SearchParams& params, uint8_t type, int32_t pieces, int32_
 }
 
 TEST(PlanMemory, TakesWhatASearchNeeds) {
-    ExpectPlan(ParamsOf(40, 30, 8, 12, 5, true), 0, 0, 0);
-    // 12 x 5 pixels are one piece; 13 * 10 placements of the wide templates, 20 * 3 of the tall.
-    ExpectPlan(ParamsOf(40, 30, 8, 12, 5, true), 1, 1, 4 * (13 * 10 + 20 * 3));
-    // 17 x 5: 16 x 4, 16 x 1 and 1 x 5; 5 x 17: two pieces.
-    ExpectPlan(ParamsOf(24, 19, 0, 17, 5, false), 1, 3, 2 * (8 * 15 + 20 * 3));
-    ExpectPlan(ParamsOf(19, 18, 0, 5, 17, false), 1, 3, 2 * (15 * 2 + 3 * 14));
+    ExpectPlan(ParamsOf(40, 30, 8, 12, 5, true), 0, 0);
+    // 13 * 10 placements of the wide templates, 20 * 3 of the tall.
+    ExpectPlan(ParamsOf(40, 30, 8, 12, 5, true), 1, 4 * (13 * 10 + 20 * 3));
+    ExpectPlan(ParamsOf(24, 19, 0, 17, 5, false), 1, 2 * (8 * 15 + 20 * 3));
+    ExpectPlan(ParamsOf(19, 18, 0, 5, 17, false), 1, 2 * (15 * 2 + 3 * 14));
     // One template at 17 placements: one more than two steps hold with the 16 bytes behind them.
     SearchParams params = ParamsOf(28, 5, 0, 12, 5, false);
     params.tpltNum = 1;
-    ExpectPlan(params, 1, 1, 17);
+    ExpectPlan(params, 1, 17);
 }
 
-// Without finger no template is valid, and nothing is planned but the keys.
+// Without finger no template is valid.
 TEST(ScorePlacements, TemplatesOutsideTheFingerAreNotPlaced) {
     const SearchParams params = ParamsOf(40, 30, 8, 12, 5, true);
     TestFrame frame(40, 30, 9, 0);

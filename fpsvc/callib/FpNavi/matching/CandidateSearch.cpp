@@ -10,12 +10,12 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <utility>
 
 #include "base/BitRows.h"
 #include "base/GreyHistogram.h"
 #include "base/NaviMath.h"
 #include "frame/NaviFrame.h"
-#include "matching/CandidateHeap.h"
 
 namespace fpnavi {
 namespace {
@@ -36,7 +36,7 @@ Cut CutDifferences(const PlacementTables& tables, int32_t num) {
     return {worst, num - below};
 }
 
-// A template that is placed, and the displacement of a placement at (0, 0) of its table.
+// A template that is placed, and the displacement of the first placement of its table.
 struct Placed {
     PlacementTable table;
     Displacement origin;
@@ -130,6 +130,26 @@ class Selection {
     int32_t m_bestDiff = kGreyLevels;
 };
 
+// Offers the placements of a row of template k to the heap keys [in, out], num of them. The root is
+// the worst key kept and only becomes smaller, so placements whose difference is above the root's
+// get no key. Reads up to 15 bytes behind the row.
+void OfferRow(const PlacementTable& table, int32_t row, int32_t k, uint32_t* keys, int32_t num) {
+    const uint8_t* const diff = table.diff + row * table.columns;
+    for (int32_t first = 0; first < table.columns; first += kLanes) {
+        uint64_t bits = AtMostBits(diff + first, std::min(table.columns - first, kLanes),
+                                   static_cast<uint8_t>(keys[0] >> 24));
+        for (; bits != 0; bits &= bits - 1) {
+            const int32_t column = first + __builtin_ctzll(bits);
+            const uint32_t key =
+                MakeKey(diff[column], table.iFirst + row, table.jFirst + column, k);
+            if (key >= keys[0])
+                continue;
+            keys[0] = key;
+            MaxHeapify(keys, num, 0);
+        }
+    }
+}
+
 }  // namespace
 
 void SelectCandidates(const TemplateSet& set, const PlacementTables& tables,
@@ -137,9 +157,29 @@ void SelectCandidates(const TemplateSet& set, const PlacementTables& tables,
     Selection(set, tables, candidates).TakeAll();
 }
 
-void ConvertKeys(const TemplateSet& set, const uint32_t* keys, const Candidates& candidates) {
-    for (int32_t m = 0; m < candidates.num; ++m)
-        candidates.Set(m, DisplacementOf(set, keys[m]));
+void RankCandidates(const PlacementTables& tables, uint32_t* keys, int32_t num) {
+    std::fill_n(keys, static_cast<size_t>(num), kKeySentinel);
+    for (int32_t k = 0; k < kTpltMax; ++k) {
+        for (int32_t row = 0; row < tables.of[k].rows; ++row)
+            OfferRow(tables.of[k], row, k, keys, num);
+    }
+}
+
+int32_t MaxHeapify(uint32_t* arr, int32_t len, int32_t i) {
+    if (arr == nullptr || len < 1)
+        return -1;
+    // Children of i are 2i + 1 and 2i + 2; none exists from len / 2 on, so that nothing overflows.
+    while (i >= 0 && i < len / 2) {
+        const int32_t left = 2 * i + 1;
+        int32_t max = arr[left] > arr[i] ? left : i;
+        if (left < len - 1 && arr[left + 1] > arr[max])
+            max = left + 1;
+        if (max == i)
+            break;
+        std::swap(arr[i], arr[max]);
+        i = max;
+    }
+    return 0;
 }
 
 int32_t FindCandidate(int32_t* candidate_di, int32_t* candidate_dj) {
@@ -157,7 +197,9 @@ int32_t FindCandidate(int32_t* candidate_di, int32_t* candidate_dj) {
         return -1;
     const SearchMemory memory = PlanMemory(params, set, candidateList);
     RankCandidates(ScorePlacements(params, set, pair, memory), memory.keys, params.candidateNum);
-    ConvertKeys(set, memory.keys, {candidate_di, candidate_dj, params.candidateNum});
+    const Candidates candidates = {candidate_di, candidate_dj, params.candidateNum};
+    for (int32_t m = 0; m < candidates.num; ++m)
+        candidates.Set(m, DisplacementOf(set, memory.keys[m]));
     std::free(candidateList);
     return 0;
 }

@@ -1,5 +1,4 @@
-// The template candidate search: small templates of one frame are slid over the other, and the
-// placements with the least grey difference become candidate displacements. Owns nothing.
+// The candidates: the placements with the least grey difference, as displacements. Owns nothing.
 #ifndef FPNAVI_CANDIDATESEARCH_H
 #define FPNAVI_CANDIDATESEARCH_H
 
@@ -29,9 +28,15 @@ struct Candidates {
 void SelectCandidates(const TemplateSet& set, const PlacementTables& tables,
                       const Candidates& candidates);
 
-// Fills candidates [out] with the displacements of keys [in], candidates.num of them, in their
-// order.
-void ConvertKeys(const TemplateSet& set, const uint32_t* keys, const Candidates& candidates);
+// Fills keys [out], num of them, with the best keys of all placements as a bounded max-heap.
+// Placements are offered template by template, row by row. Sentinels stay where there are fewer
+// than num.
+void RankCandidates(const PlacementTables& tables, uint32_t* keys, int32_t num);
+
+// Sift-down of arr[i] in arr [in, out], a max-heap of len keys, the caller's. Ties: a parent stays
+// above an equal child, and the left child is preferred to an equal right one. Returns 0 (also for
+// i >= len), or -1 for a null arr or len < 1.
+int32_t MaxHeapify(uint32_t* arr, int32_t len, int32_t i);
 
 // Fills both arrays [out] (s_candidateNum entries, the caller's) with the displacements, rows and
 // columns in pixels of the frame that FindMatch compares, of the best placements of the templates

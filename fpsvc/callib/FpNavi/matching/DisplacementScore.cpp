@@ -7,16 +7,14 @@
 namespace fpnavi {
 namespace {
 
-// Cuts an axis into bands. Without tiles or without gaps there is one band.
+// Cuts an axis into bands: one without tiles or without gaps, none when they do not make up the
+// side.
 TileAxis CutAxis(int32_t side, int32_t bound, int32_t center, int32_t gap, bool tiled) {
-    if (!tiled)
-        return {{{0, side}, {0, 0}, {0, 0}}, 1, 0, side};
-    const int64_t fullSide = side + 2 * int64_t{gap};
-    const bool fits = bound >= 0 && center >= 0 && gap >= 0 && fullSide <= kSideMax &&
-                      side - 2 * int64_t{bound} == center;
-    if (!fits)
+    const int64_t fullSide = tiled ? side + 2 * int64_t{gap} : side;
+    if (tiled && (bound < 0 || center < 0 || gap < 0 || fullSide > kSideMax ||
+                  side - 2 * int64_t{bound} != center))
         return {{}, 0, 0, 0};
-    if (gap == 0)
+    if (!tiled || gap == 0)
         return {{{0, side}, {0, 0}, {0, 0}}, 1, 0, side};
     return {{{0, bound}, {bound, side - bound}, {side - bound, side}},
             kBandMax,
@@ -31,44 +29,32 @@ Meeting MeetStep(const TileAxis& axis, int32_t displacement, int32_t step) {
     return meeting;
 }
 
-// Calls add with the meeting of each step at which some places meet. Step n needs an offset > 0 to
-// reach a later band, step -n an offset < 0 to reach an earlier one: |displacement| > n * gap.
-template <typename Add>
-void MeetAlong(const TileAxis& axis, int32_t displacement, Add add) {
+// Makes meetings [out] those of displacement, unless they are already; make(meeting) makes a step.
+// Step n needs an offset > 0 to reach a later band, step -n an offset < 0 to reach an earlier one:
+// |displacement| > n * gap.
+template <typename Step, typename Make>
+void MeetAt(const TileAxis& axis, int32_t displacement, Make make, Meetings<Step>* meetings) {
+    if (meetings->count >= 0 && meetings->displacement == displacement)
+        return;
+    meetings->displacement = displacement;
+    meetings->places = 0;
+    meetings->count = 0;
     if (displacement >= axis.fullSide || displacement <= -axis.fullSide)
         return;
     const int32_t direction = displacement < 0 ? -1 : 1;
     const int32_t distance = displacement * direction;
     for (int32_t n = 0; n < axis.count && (n == 0 || distance > n * axis.gap); ++n) {
         const Meeting meeting = MeetStep(axis, displacement, n * direction);
-        if (meeting.count > 0)
-            add(meeting);
+        if (meeting.count == 0)
+            continue;
+        meetings->places += meeting.places;
+        meetings->steps[meetings->count++] = make(meeting);
     }
-}
-
-void MeetRows(const TileAxis& axis, int32_t displacement, RowMeetings* meetings) {
-    meetings->displacement = displacement;
-    meetings->places = 0;
-    meetings->count = 0;
-    MeetAlong(axis, displacement, [meetings](const Meeting& meeting) {
-        meetings->places += meeting.places;
-        meetings->steps[meetings->count++] = meeting;
-    });
-}
-
-void MeetColumns(const TileAxis& axis, int32_t displacement, ColumnMeetings* meetings) {
-    meetings->displacement = displacement;
-    meetings->places = 0;
-    meetings->count = 0;
-    MeetAlong(axis, displacement, [meetings](const Meeting& meeting) {
-        meetings->places += meeting.places;
-        meetings->steps[meetings->count++] = CutColumns(meeting);
-    });
 }
 
 // Calls visit with each pairing of tiles until it returns false.
 template <typename Visit>
-void ForEachPairing(const RowMeetings& rows, const ColumnMeetings& columns, Visit visit) {
+void ForEachPairing(const Meetings<Meeting>& rows, const ColumnMeetings& columns, Visit visit) {
     for (int32_t r = 0; r < rows.count; ++r) {
         for (int32_t c = 0; c < columns.count; ++c) {
             if (!visit(Pairing{&rows.steps[r], &columns.steps[c]}))
@@ -90,23 +76,17 @@ DisplacementScore::DisplacementScore(const SearchParams& params, const FramePair
                            params.tiled)),
       m_slots(slots),
       m_slotMask(count - 1) {
-    MeetRows(m_rowAxis, 0, &m_rows);
+    m_rows.count = -1;
     for (int32_t n = 0; n < count; ++n)
         slots[n].count = -1;
 }
 
-const ColumnMeetings& DisplacementScore::ColumnsAt(int32_t dj) {
-    ColumnMeetings& slot = m_slots[dj & m_slotMask];
-    if (slot.count < 0 || slot.displacement != dj)
-        MeetColumns(m_columnAxis, dj, &slot);
-    return slot;
-}
-
 int32_t DisplacementScore::At(const Displacement& displacement, int32_t most) {
-    if (displacement.di != m_rows.displacement)
-        MeetRows(m_rowAxis, displacement.di, &m_rows);
-    const RowMeetings& rows = m_rows;
-    const ColumnMeetings& columns = ColumnsAt(displacement.dj);
+    const Meetings<Meeting>& rows = m_rows;
+    ColumnMeetings& columns = m_slots[displacement.dj & m_slotMask];
+    MeetAt(
+        m_rowAxis, displacement.di, [](const Meeting& meeting) { return meeting; }, &m_rows);
+    MeetAt(m_columnAxis, displacement.dj, CutColumns, &columns);
     // score <= most means sum < (most + 1) * area; the area is at most each of these. places *
     // places <= 2^24.
     const int32_t mostArea = std::min({rows.places * columns.places, m_first.area, m_second.area});

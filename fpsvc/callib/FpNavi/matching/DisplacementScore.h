@@ -30,22 +30,19 @@ struct TileAxis {
     int32_t fullSide;  // of the full image
 };
 
-// What meets along the rows at a displacement: one meeting for each step at which any place does.
-// Steps have the sign of the displacement, so there are at most three: 0, 1, 2 or 0, -1, -2.
-struct RowMeetings {
+// What meets along one axis at a displacement: one step for each distance of bands at which any
+// place does. Distances have the sign of the displacement, so there are at most three: 0, 1, 2 or
+// 0, -1, -2.
+template <typename Step>
+struct Meetings {
     int32_t displacement;
     int32_t places;  // in all steps, at most the side: a place meets one band only
-    int32_t count;
-    Meeting steps[kBandMax];
+    int32_t count;   // -1: not made yet
+    Step steps[kBandMax];
 };
 
-// The same along the columns, kept in a slot of a table: the last displacement that hashed to it.
-struct ColumnMeetings {
-    int32_t displacement;
-    int32_t places;
-    int32_t count;  // -1 in an empty slot
-    Columns steps[kBandMax];
-};
+// Those of columns are kept in a table: the last displacement of each slot.
+using ColumnMeetings = Meetings<Columns>;
 
 inline constexpr int32_t kColumnSlots = 32;  // of a search; candidates often share their columns
 
@@ -63,14 +60,12 @@ class DisplacementScore {
     int32_t At(const Displacement& displacement, int32_t most);
 
   private:
-    const ColumnMeetings& ColumnsAt(int32_t dj);
-
     const LaidFrame& m_first;
     const LaidFrame& m_second;
     const int32_t m_overlapAreaMin;
     const TileAxis m_rowAxis;
     const TileAxis m_columnAxis;
-    RowMeetings m_rows;  // of the last displacement
+    Meetings<Meeting> m_rows;  // of the last displacement
     ColumnMeetings* const m_slots;
     const int32_t m_slotMask;
 };

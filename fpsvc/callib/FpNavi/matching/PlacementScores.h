@@ -22,13 +22,17 @@ struct PlacementTable {
     int32_t Count() const { return rows * columns; }
 };
 
+struct PlacementTables {
+    PlacementTable of[kTpltMax];
+    int32_t Count() const;  // placements of all templates
+};
+
 // The memory of one search, cut from one block of bytes bytes. All is scratch: each part is written
 // before it is read.
 struct SearchMemory {
     uint32_t* keys;           // one for each candidate
-    uint8_t* packed;          // the pieces of four templates of one size, kPiecePixels each
     uint8_t* strips;          // of the searched frame
-    uint32_t* sums;           // of a block's placements, for templates of more than one piece
+    uint32_t* sums;           // of a block's placements, for four templates
     ColumnMeetings* columns;  // of the match, kColumnSlots
     uint8_t* scores;          // all tables, and 16 bytes: a step of sixteen may read 15 of them
     size_t bytes;             // of all
@@ -38,13 +42,8 @@ struct SearchMemory {
 // member bytes of the result is of use: the size to allocate.
 SearchMemory PlanMemory(const SearchParams& params, const TemplateSet& set, uint8_t* block);
 
-struct PlacementTables {
-    PlacementTable of[kTpltMax];
-    int32_t Count() const;  // placements of all templates
-};
-
 // Scores all placements of the valid templates of set in pair.Searched(). The tables of the result
-// lie in memory.scores; packed, strips and sums of memory are overwritten.
+// lie in memory.scores; strips and sums of memory are overwritten.
 PlacementTables ScorePlacements(const SearchParams& params, const TemplateSet& set,
                                 const FramePair& pair, const SearchMemory& memory);
 
