@@ -264,8 +264,8 @@ int32_t PlainScore(int32_t di, int32_t dj) {
 
 int32_t ModuleScore(int32_t di, int32_t dj, int32_t most) {
     const fpnavi::FramePair pair = fpnavi::LayOutPair(fpnavi::s_imagePrev, fpnavi::s_imageCurr);
-    fpnavi::ColumnMeetings columns;
-    fpnavi::DisplacementScore score(fpnavi::CurrentSearchParams(), pair, &columns, 1);
+    fpnavi::MeetingSlot slot;
+    fpnavi::DisplacementScore score(fpnavi::CurrentSearchParams(), pair, &slot, 1);
     return score.At({di, dj}, most);
 }
 

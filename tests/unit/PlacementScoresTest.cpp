@@ -156,8 +156,8 @@ void ExpectPlan(const SearchParams& params, uint8_t type, int32_t placements) {
     at += 16 * (15 * 16 + 2 * 64);  // sixteen strips of a block
     EXPECT_EQ(At(memory.sums, block), at);
     at += 4 * 16 * 16 * 4;  // of four templates at 16 x 16 placements
-    EXPECT_EQ(At(memory.columns, block), at);
-    at += (kColumnSlots * static_cast<ptrdiff_t>(sizeof(ColumnMeetings)) + 15) / 16 * 16;
+    EXPECT_EQ(At(memory.slots, block), at);
+    at += kMeetingSlots * static_cast<ptrdiff_t>(sizeof(MeetingSlot));
     EXPECT_EQ(At(memory.scores, block), at);
     at += (placements + 16 + 15) / 16 * 16;
     EXPECT_EQ(static_cast<ptrdiff_t>(block.size()), at);

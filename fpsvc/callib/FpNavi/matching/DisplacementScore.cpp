@@ -29,6 +29,10 @@ Meeting MeetStep(const TileAxis& axis, int32_t displacement, int32_t step) {
     return meeting;
 }
 
+Meeting AsItIs(const Meeting& meeting) {
+    return meeting;
+}
+
 // Makes meetings [out] those of displacement, unless they are already; make(meeting) makes a step.
 // Step n needs an offset > 0 to reach a later band, step -n an offset < 0 to reach an earlier one:
 // |displacement| > n * gap.
@@ -54,7 +58,7 @@ void MeetAt(const TileAxis& axis, int32_t displacement, Make make, Meetings<Step
 
 // Calls visit with each pairing of tiles until it returns false.
 template <typename Visit>
-void ForEachPairing(const Meetings<Meeting>& rows, const ColumnMeetings& columns, Visit visit) {
+void ForEachPairing(const Meetings<Meeting>& rows, const Meetings<Columns>& columns, Visit visit) {
     for (int32_t r = 0; r < rows.count; ++r) {
         for (int32_t c = 0; c < columns.count; ++c) {
             if (!visit(Pairing{&rows.steps[r], &columns.steps[c]}))
@@ -66,7 +70,7 @@ void ForEachPairing(const Meetings<Meeting>& rows, const ColumnMeetings& columns
 }  // namespace
 
 DisplacementScore::DisplacementScore(const SearchParams& params, const FramePair& pair,
-                                     ColumnMeetings* slots, int32_t count)
+                                     MeetingSlot* slots, int32_t count)
     : m_first(pair.Cut()),
       m_second(pair.Searched()),
       m_overlapAreaMin(params.overlapAreaMin),
@@ -76,16 +80,14 @@ DisplacementScore::DisplacementScore(const SearchParams& params, const FramePair
                            params.tiled)),
       m_slots(slots),
       m_slotMask(count - 1) {
-    m_rows.count = -1;
     for (int32_t n = 0; n < count; ++n)
-        slots[n].count = -1;
+        slots[n].rows.count = slots[n].columns.count = -1;
 }
 
 int32_t DisplacementScore::At(const Displacement& displacement, int32_t most) {
-    const Meetings<Meeting>& rows = m_rows;
-    ColumnMeetings& columns = m_slots[displacement.dj & m_slotMask];
-    MeetAt(
-        m_rowAxis, displacement.di, [](const Meeting& meeting) { return meeting; }, &m_rows);
+    Meetings<Meeting>& rows = m_slots[displacement.di & m_slotMask].rows;
+    Meetings<Columns>& columns = m_slots[displacement.dj & m_slotMask].columns;
+    MeetAt(m_rowAxis, displacement.di, AsItIs, &rows);
     MeetAt(m_columnAxis, displacement.dj, CutColumns, &columns);
     // score <= most means sum < (most + 1) * area; the area is at most each of these. places *
     // places <= 2^24.

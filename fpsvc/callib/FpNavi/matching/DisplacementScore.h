@@ -41,16 +41,20 @@ struct Meetings {
     Step steps[kBandMax];
 };
 
-// Those of columns are kept in a table: the last displacement of each slot.
-using ColumnMeetings = Meetings<Columns>;
+// The meetings of both axes that are kept for the next displacement: candidates often share their
+// rows or columns.
+struct MeetingSlot {
+    Meetings<Meeting> rows;
+    Meetings<Columns> columns;
+};
 
-inline constexpr int32_t kColumnSlots = 32;  // of a search; candidates often share their columns
+inline constexpr int32_t kMeetingSlots = 32;  // of a search
 
 // Scores displacements of a pair of frames, one after the other.
 class DisplacementScore {
   public:
     // slots [out]: count of them, a power of two, the caller's; used by all calls of At.
-    DisplacementScore(const SearchParams& params, const FramePair& pair, ColumnMeetings* slots,
+    DisplacementScore(const SearchParams& params, const FramePair& pair, MeetingSlot* slots,
                       int32_t count);
 
     // Mean grey difference over the finger area that both frames have in common when pixel
@@ -65,8 +69,7 @@ class DisplacementScore {
     const int32_t m_overlapAreaMin;
     const TileAxis m_rowAxis;
     const TileAxis m_columnAxis;
-    Meetings<Meeting> m_rows;  // of the last displacement
-    ColumnMeetings* const m_slots;
+    MeetingSlot* const m_slots;
     const int32_t m_slotMask;
 };
 

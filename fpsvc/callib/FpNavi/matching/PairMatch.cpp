@@ -86,7 +86,7 @@ Match SearchMatch(const SearchParams& params, const TemplateSet& set, const Fram
                   const SearchMemory& memory, const Candidates& candidates) {
     const PlacementTables tables = ScorePlacements(params, set, pair, memory);
     SelectCandidates(set, tables, candidates);
-    DisplacementScore score(params, pair, memory.columns, kColumnSlots);
+    DisplacementScore score(params, pair, memory.slots, kMeetingSlots);
     const Best best = ScoreAll(candidates, &score);
     if (best.count == 1)
         return {candidates.At(0), best.diff};
@@ -185,8 +185,8 @@ int32_t FindMatch(const int32_t* candidate_di, const int32_t* candidate_dj, int3
         return -1;
     const SearchParams params = CurrentSearchParams();
     const FramePair pair = LayOutPair(s_imagePrev, s_imageCurr);
-    ColumnMeetings columns;
-    DisplacementScore score(params, pair, &columns, 1);
+    MeetingSlot slot;
+    DisplacementScore score(params, pair, &slot, 1);
     Match best = {{0, 0}, kDiffWorst + 1};
     for (int32_t k = 0; k < params.candidateNum; ++k) {
         const Displacement displacement = {candidate_di[k], candidate_dj[k]};

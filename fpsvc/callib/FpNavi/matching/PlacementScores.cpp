@@ -269,7 +269,7 @@ SearchMemory PlanMemory(const SearchParams& params, const TemplateSet& set, uint
         take(static_cast<size_t>(params.candidateNum) * sizeof *memory.keys));
     memory.strips = static_cast<uint8_t*>(take(kBlockColumns * kStripBytes));
     memory.sums = static_cast<uint32_t*>(take(sizeof(uint32_t[kAlike * kBlockSums])));
-    memory.columns = static_cast<ColumnMeetings*>(take(sizeof(ColumnMeetings[kColumnSlots])));
+    memory.slots = static_cast<MeetingSlot*>(take(sizeof(MeetingSlot[kMeetingSlots])));
     memory.scores = static_cast<uint8_t*>(take(scores + kLanes));
     return memory;
 }

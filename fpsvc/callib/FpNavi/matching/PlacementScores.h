@@ -30,12 +30,12 @@ struct PlacementTables {
 // The memory of one search, cut from one block of bytes bytes. All is scratch: each part is written
 // before it is read.
 struct SearchMemory {
-    uint32_t* keys;           // one for each candidate
-    uint8_t* strips;          // of the searched frame
-    uint32_t* sums;           // of a block's placements, for four templates
-    ColumnMeetings* columns;  // of the match, kColumnSlots
-    uint8_t* scores;          // all tables, and 16 bytes: a step of sixteen may read 15 of them
-    size_t bytes;             // of all
+    uint32_t* keys;      // one for each candidate
+    uint8_t* strips;     // of the searched frame
+    uint32_t* sums;      // of a block's placements, for four templates
+    MeetingSlot* slots;  // of the match, kMeetingSlots
+    uint8_t* scores;     // all tables, and 16 bytes: a step of sixteen may read 15 of them
+    size_t bytes;        // of all
 };
 
 // Cuts the memory of a search from block, the caller's, aligned to 16. With a null block only the
