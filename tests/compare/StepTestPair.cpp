@@ -233,7 +233,7 @@ Candidates SelectedCandidates() {
 }
 
 int32_t PlacementCount() {
-    return ScoredPair().tables.Count();
+    return ScoredPair().tables.placements;
 }
 
 std::ostream& operator<<(std::ostream& out, const MatchResult& match) {

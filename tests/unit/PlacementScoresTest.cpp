@@ -90,13 +90,15 @@ void CompareScores(const SearchParams& params, bool noise) {
     EXPECT_EQ(memory.bytes, plan.bytes);
     const PlacementTables tables = ScorePlacements(params, set, pair, memory);
     int32_t count = 0;
+    ASSERT_EQ(tables.count, params.tpltNum);
     for (int32_t k = 0; k < params.tpltNum; ++k) {
+        EXPECT_EQ(tables.of[k].k, k);
         CompareTable(frames, params, set.tplts[k], tables.of[k]);
         ASSERT_FALSE(::testing::Test::HasFailure()) << "template " << k;
         EXPECT_EQ(tables.of[k].diff, tables.of[0].diff + count) << "tables follow each other";
-        count += tables.of[k].Count();
+        count += tables.of[k].rows * tables.of[k].columns;
     }
-    EXPECT_EQ(tables.Count(), count);
+    EXPECT_EQ(tables.placements, count);
 }
 
 TEST(ScorePlacements, EveryTemplateSizeGivesTheMeans) {
@@ -186,9 +188,8 @@ TEST(ScorePlacements, TemplatesOutsideTheFingerAreNotPlaced) {
     std::vector<uint8_t> block(PlanMemory(params, set, nullptr).bytes);
     const PlacementTables tables =
         ScorePlacements(params, set, pair, PlanMemory(params, set, block.data()));
-    EXPECT_EQ(tables.Count(), 0);
-    for (const PlacementTable& table : tables.of)
-        EXPECT_EQ(table.rows, 0);
+    EXPECT_EQ(tables.count, 0);
+    EXPECT_EQ(tables.placements, 0);
 }
 
 // 4096 x 4095 pixels, of which one lacks a grey level for a mean of 255: the remainder is as large
@@ -204,7 +205,7 @@ TEST(ScorePlacements, LargestTemplateIsDividedExactly) {
     std::vector<uint8_t> block(PlanMemory(params, set, nullptr).bytes);
     const SearchMemory memory = PlanMemory(params, set, block.data());
     const PlacementTables tables = ScorePlacements(params, set, pair, memory);
-    ASSERT_EQ(tables.Count(), 1);
+    ASSERT_EQ(tables.placements, 1);
     EXPECT_EQ(tables.of[0].diff[0], 255);
     searched.Grey(4094, 4095) = 1;
     EXPECT_EQ(ScorePlacements(params, set, pair, memory).of[0].diff[0], 254);

@@ -28,7 +28,7 @@ struct Cut {
 
 Cut CutDifferences(const PlacementTables& tables, int32_t num) {
     int32_t counts[kGreyLevels];
-    CountBytes(tables.of[0].diff, tables.Count(), counts);
+    CountBytes(tables.of[0].diff, tables.placements, counts);
     int32_t below = 0;
     int32_t worst = 0;
     while (worst < kDiffKept && below + counts[worst] < num)
@@ -36,56 +36,47 @@ Cut CutDifferences(const PlacementTables& tables, int32_t num) {
     return {worst, num - below};
 }
 
-// A template that is placed, and the displacement of the first placement of its table.
-struct Placed {
-    PlacementTable table;
-    Displacement origin;
-};
-
 // Takes the placements that are kept, in ascending order of rows, columns and templates.
 class Selection {
   public:
     Selection(const TemplateSet& set, const PlacementTables& tables, const Candidates& candidates)
-        : m_sentinel(DisplacementOf(set, kKeySentinel)),
+        : m_set(set),
+          m_tables(tables),
           m_candidates(candidates),
-          m_cut(CutDifferences(tables, candidates.num)) {
-        for (int32_t k = 0; k < kTpltMax; ++k) {
-            const PlacementTable& table = tables.of[k];
-            if (table.rows == 0)
-                continue;
-            m_placed[m_count++] = {table,
-                                   DisplacementOf(set, MakeKey(0, table.iFirst, table.jFirst, k))};
-            m_rows = std::max(m_rows, table.rows);
-            m_columns = std::max(m_columns, table.columns);
-        }
-    }
+          m_cut(CutDifferences(tables, candidates.num)) {}
 
     void TakeAll() {
-        for (int32_t row = 0; row < m_rows; ++row) {
-            for (int32_t column = 0; column < m_columns; column += kWordPixels)
+        int32_t rows = 0;  // most of all tables
+        int32_t columns = 0;
+        for (int32_t t = 0; t < m_tables.count; ++t) {
+            rows = std::max(rows, m_tables.of[t].rows);
+            columns = std::max(columns, m_tables.of[t].columns);
+        }
+        for (int32_t row = 0; row < rows; ++row) {
+            for (int32_t column = 0; column < columns; column += kWordPixels)
                 TakeRow(row, column);
         }
         PutBestFirst();
     }
 
   private:
-    // Takes from 64 columns of a row. Bit c of kept[t]: column + c of template t differs by at most
+    // Takes from 64 columns of a row. Bit c of kept[t]: column + c of table t differs by at most
     // worst.
     void TakeRow(int32_t row, int32_t column) {
         uint64_t kept[kTpltMax];
         uint64_t any = 0;
-        for (int32_t t = 0; t < m_count; ++t) {
-            kept[t] = FindKept(m_placed[t].table, row, column);
+        for (int32_t t = 0; t < m_tables.count; ++t) {
+            kept[t] = FindKept(m_tables.of[t], row, column);
             any |= kept[t];
         }
         for (; any != 0; any &= any - 1) {
             const int32_t bit = __builtin_ctzll(any);
-            // Mostly one template has the bit; a branch for each template would be mispredicted.
+            // Mostly one table has the bit; a branch for each table would be mispredicted.
             uint32_t having = 0;
-            for (int32_t t = 0; t < m_count; ++t)
+            for (int32_t t = 0; t < m_tables.count; ++t)
                 having |= static_cast<uint32_t>(kept[t] >> bit & 1U) << t;
             for (; having != 0; having &= having - 1)
-                Take(m_placed[__builtin_ctz(having)], row, column + bit);
+                Take(m_tables.of[__builtin_ctz(having)], row, column + bit);
         }
     }
 
@@ -97,8 +88,8 @@ class Selection {
                           static_cast<uint8_t>(m_cut.worst));
     }
 
-    void Take(const Placed& placed, int32_t row, int32_t column) {
-        const int32_t diff = placed.table.diff[row * placed.table.columns + column];
+    void Take(const PlacementTable& table, int32_t row, int32_t column) {
+        const int32_t diff = table.diff[row * table.columns + column];
         if (diff == m_cut.worst && m_cut.wanted-- <= 0)
             return;
         if (diff < m_bestDiff) {
@@ -106,34 +97,31 @@ class Selection {
             m_best = m_taken;
         }
         m_candidates.Set(m_taken++,
-                         {WrapAdd(placed.origin.di, row), WrapAdd(placed.origin.dj, column)});
+                         {WrapAdd(table.first.di, row), WrapAdd(table.first.dj, column)});
     }
 
     // The best placement mostly matches best, and then the scores of the others stop early.
     void PutBestFirst() {
         while (m_taken < m_candidates.num)
-            m_candidates.Set(m_taken++, m_sentinel);
+            m_candidates.Set(m_taken++, DisplacementOf(m_set, kKeySentinel));
         const Displacement best = m_candidates.At(m_best);
         m_candidates.Set(m_best, m_candidates.At(0));
         m_candidates.Set(0, best);
     }
 
-    const Displacement m_sentinel;
+    const TemplateSet& m_set;
+    const PlacementTables& m_tables;
     const Candidates m_candidates;
     Cut m_cut;
-    Placed m_placed[kTpltMax];
-    int32_t m_count = 0;
-    int32_t m_rows = 0;  // most of all tables
-    int32_t m_columns = 0;
     int32_t m_taken = 0;
     int32_t m_best = 0;
     int32_t m_bestDiff = kGreyLevels;
 };
 
-// Offers the placements of a row of template k to the heap keys [in, out], num of them. The root is
-// the worst key kept and only becomes smaller, so placements whose difference is above the root's
-// get no key. Reads up to 15 bytes behind the row.
-void OfferRow(const PlacementTable& table, int32_t row, int32_t k, uint32_t* keys, int32_t num) {
+// Offers the placements of a row to the heap keys [in, out], num of them. The root is the worst key
+// kept and only becomes smaller, so placements whose difference is above the root's get no key.
+// Reads up to 15 bytes behind the row.
+void OfferRow(const PlacementTable& table, int32_t row, uint32_t* keys, int32_t num) {
     const uint8_t* const diff = table.diff + row * table.columns;
     for (int32_t first = 0; first < table.columns; first += kLanes) {
         uint64_t bits = AtMostBits(diff + first, std::min(table.columns - first, kLanes),
@@ -141,7 +129,7 @@ void OfferRow(const PlacementTable& table, int32_t row, int32_t k, uint32_t* key
         for (; bits != 0; bits &= bits - 1) {
             const int32_t column = first + __builtin_ctzll(bits);
             const uint32_t key =
-                MakeKey(diff[column], table.iFirst + row, table.jFirst + column, k);
+                MakeKey(diff[column], table.iFirst + row, table.jFirst + column, table.k);
             if (key >= keys[0])
                 continue;
             keys[0] = key;
@@ -159,9 +147,9 @@ void SelectCandidates(const TemplateSet& set, const PlacementTables& tables,
 
 void RankCandidates(const PlacementTables& tables, uint32_t* keys, int32_t num) {
     std::fill_n(keys, static_cast<size_t>(num), kKeySentinel);
-    for (int32_t k = 0; k < kTpltMax; ++k) {
-        for (int32_t row = 0; row < tables.of[k].rows; ++row)
-            OfferRow(tables.of[k], row, k, keys, num);
+    for (int32_t t = 0; t < tables.count; ++t) {
+        for (int32_t row = 0; row < tables.of[t].rows; ++row)
+            OfferRow(tables.of[t], row, keys, num);
     }
 }
 

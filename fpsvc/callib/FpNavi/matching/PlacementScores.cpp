@@ -33,18 +33,17 @@ constexpr int32_t kTogether = 4;  // neighbouring placements
 constexpr int32_t kStripBytes = 15 * kPieceWidth + 2 * kPiecePixels;
 
 constexpr int32_t kAlike = 4;  // templates of one size
-
-// The wide templates, then the tall ones.
-constexpr int32_t kGroups[kTpltMax / kAlike][kAlike] = {{0, 1, 4, 5}, {2, 3, 6, 7}};
+constexpr int32_t kTall = 2;   // bit of a tall template's number
 
 // Templates of one size that are placed, and what they are scored with.
 struct Group {
     const TemplateSet& set;
-    const PlacementTables& tables;
     const FramePair& pair;
     const SearchMemory& memory;
     int32_t count;
-    int32_t k[kAlike];
+    const PlacementTable* tables[kAlike];
+
+    const Template& At(int32_t t) const { return set.tplts[tables[t]->k]; }
 };
 
 // A block of placements, or a piece of a template: rows x columns from row, column on.
@@ -170,19 +169,19 @@ void ScorePiece(const Group& group, int32_t t, const Rectangle& block, const Rec
     constexpr Rows kRows[kSteps + 1] = {ScoreRows<0, Store>, ScoreRows<1, Store>,
                                         ScoreRows<2, Store>, ScoreRows<3, Store>,
                                         ScoreRows<4, Store>};
-    const PackedPiece packed = PackPiece(group.pair.Cut(), group.set.tplts[group.k[t]], piece);
+    const PackedPiece packed = PackPiece(group.pair.Cut(), group.At(t), piece);
     kRows[piece.Size() / kLanes](block, piece.columns, packed, group.memory.strips, store);
 }
 
 // Where template t of the group has the mean of the block's first placement.
 uint8_t* MeansOf(const Group& group, int32_t t, const Rectangle& block) {
-    const PlacementTable& table = group.tables.of[group.k[t]];
+    const PlacementTable& table = *group.tables[t];
     return table.diff + (block.row - table.iFirst) * table.columns + block.column - table.jFirst;
 }
 
 void ScorePieces(const Group& group, const Rectangle& block) {
-    const Template& alike = group.set.tplts[group.k[0]];
-    const int32_t tableColumns = group.tables.of[group.k[0]].columns;
+    const Template& alike = group.At(0);
+    const int32_t tableColumns = group.tables[0]->columns;
     uint32_t* const sums = group.memory.sums;
     std::fill_n(sums, group.count * kBlockSums, 0U);
     for (int32_t column = 0; column < alike.width; column += kPieceWidth) {
@@ -211,21 +210,21 @@ void ScorePieces(const Group& group, const Rectangle& block) {
 }
 
 void ScoreBlock(const Group& group, const Rectangle& block) {
-    const Template& alike = group.set.tplts[group.k[0]];
+    const Template& alike = group.At(0);
     const Rectangle piece = {0, 0, alike.height, alike.width};
     if (alike.width > kPieceWidth || piece.Size() > kPiecePixels)
         return ScorePieces(group, block);
     CutStrips(group.pair.Searched(), block, piece, group.memory.strips);
     const uint32_t pixels = static_cast<uint32_t>(group.set.tpltSize);
     const uint32_t reciprocal = ((1U << MeanStore::kBits) - 1) / pixels + 1;
-    const int32_t tableColumns = group.tables.of[group.k[0]].columns;
+    const int32_t tableColumns = group.tables[0]->columns;
     for (int32_t t = 0; t < group.count; ++t)
         ScorePiece(group, t, block, piece,
                    MeanStore{MeansOf(group, t, block), tableColumns, reciprocal});
 }
 
 void ScoreGroup(const Group& group) {
-    const PlacementTable& table = group.tables.of[group.k[0]];
+    const PlacementTable& table = *group.tables[0];
     for (int32_t row = 0; row < table.rows; row += kBlockRows) {
         for (int32_t c = 0; c < table.columns; c += kBlockColumns)
             ScoreBlock(group, {table.iFirst + row, table.jFirst + c,
@@ -234,30 +233,29 @@ void ScoreGroup(const Group& group) {
     }
 }
 
-// The table of template k, whose differences are to lie at diff.
-PlacementTable PlanTable(const SearchParams& params, const TemplateSet& set, int32_t k,
-                         uint8_t* diff) {
-    const Placements where = PlacementsOf(params, set.tplts[k]);
-    if (!set.valid[k] || where.Empty())
-        return {0, 0, 0, 0, diff};
-    return {static_cast<int32_t>(where.iFirst), static_cast<int32_t>(where.jFirst),
-            static_cast<int32_t>(where.iLast - where.iFirst + 1),
-            static_cast<int32_t>(where.jLast - where.jFirst + 1), diff};
+// The tables, which are to lie at diff [out].
+PlacementTables PlanTables(const SearchParams& params, const TemplateSet& set, uint8_t* diff) {
+    PlacementTables tables;
+    tables.count = tables.placements = 0;
+    for (int32_t k = 0; k < kTpltMax; ++k) {
+        const Placements where = PlacementsOf(params, set.tplts[k]);
+        if (!set.valid[k] || where.Empty())
+            continue;
+        const int32_t i = static_cast<int32_t>(where.iFirst);
+        const int32_t j = static_cast<int32_t>(where.jFirst);
+        const int32_t rows = static_cast<int32_t>(where.iLast - where.iFirst + 1);
+        const int32_t columns = static_cast<int32_t>(where.jLast - where.jFirst + 1);
+        const Displacement first = DisplacementOf(set, MakeKey(0, i, j, k));
+        tables.of[tables.count++] = {k, i, j, first, rows, columns, diff + tables.placements};
+        tables.placements += rows * columns;
+    }
+    return tables;
 }
 
 }  // namespace
 
-int32_t PlacementTables::Count() const {
-    int32_t count = 0;
-    for (const PlacementTable& table : of)
-        count += table.Count();
-    return count;
-}
-
 SearchMemory PlanMemory(const SearchParams& params, const TemplateSet& set, uint8_t* block) {
-    size_t scores = 0;
-    for (int32_t k = 0; k < kTpltMax; ++k)
-        scores += static_cast<size_t>(PlanTable(params, set, k, nullptr).Count());
+    const int32_t placements = PlanTables(params, set, nullptr).placements;
     SearchMemory memory = {};
     // Each part starts at a multiple of sixteen.
     const auto take = [&memory, block](size_t bytes) -> void* {
@@ -270,23 +268,18 @@ SearchMemory PlanMemory(const SearchParams& params, const TemplateSet& set, uint
     memory.strips = static_cast<uint8_t*>(take(kBlockColumns * kStripBytes));
     memory.sums = static_cast<uint32_t*>(take(sizeof(uint32_t[kAlike * kBlockSums])));
     memory.slots = static_cast<MeetingSlot*>(take(sizeof(MeetingSlot[kMeetingSlots])));
-    memory.scores = static_cast<uint8_t*>(take(scores + kLanes));
+    memory.scores = static_cast<uint8_t*>(take(static_cast<size_t>(placements) + kLanes));
     return memory;
 }
 
 PlacementTables ScorePlacements(const SearchParams& params, const TemplateSet& set,
                                 const FramePair& pair, const SearchMemory& memory) {
-    PlacementTables tables;
-    uint8_t* scores = memory.scores;
-    for (int32_t k = 0; k < kTpltMax; ++k) {
-        tables.of[k] = PlanTable(params, set, k, scores);
-        scores += tables.of[k].Count();
-    }
-    for (const auto& alike : kGroups) {
-        Group group = {set, tables, pair, memory, 0, {}};
-        for (const int32_t k : alike) {
-            if (tables.of[k].rows > 0)
-                group.k[group.count++] = k;
+    const PlacementTables tables = PlanTables(params, set, memory.scores);
+    for (const int32_t tall : {0, kTall}) {
+        Group group = {set, pair, memory, 0, {}};
+        for (int32_t t = 0; t < tables.count; ++t) {
+            if ((tables.of[t].k & kTall) == tall)
+                group.tables[group.count++] = &tables.of[t];
         }
         if (group.count > 0)
             ScoreGroup(group);

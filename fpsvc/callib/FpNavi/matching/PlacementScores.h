@@ -10,21 +10,22 @@
 
 namespace fpnavi {
 
-// Mean grey differences of the placements of one template, row by row. The tables of a search
-// follow each other in memory.
+// Mean grey differences of the placements of one template, row by row.
 struct PlacementTable {
-    int32_t iFirst;
+    int32_t k;       // the template
+    int32_t iFirst;  // of the first placement
     int32_t jFirst;
-    int32_t rows;  // 0 for a template that is not placed
+    Displacement first;  // of the first placement
+    int32_t rows;
     int32_t columns;
     uint8_t* diff;  // rows * columns
-
-    int32_t Count() const { return rows * columns; }
 };
 
+// Of the templates that are placed, in their order. The tables follow each other in memory.
 struct PlacementTables {
     PlacementTable of[kTpltMax];
-    int32_t Count() const;  // placements of all templates
+    int32_t count;       // templates
+    int32_t placements;  // of all templates
 };
 
 // The memory of one search, cut from one block of bytes bytes. All is scratch: each part is written
