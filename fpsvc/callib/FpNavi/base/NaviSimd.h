@@ -20,7 +20,7 @@ inline constexpr int32_t kLanes = 16;
 
 using Bytes16 = uint8_t __attribute__((vector_size(16)));
 using Quads = uint32_t __attribute__((vector_size(16)));
-using Sums = Quads;  // partial sums: two of the first eight bytes, two of the others
+using Sums = Quads;  // partial sums: 0 and 1 of the first eight bytes, 2 and 3 of the others
 
 inline Bytes16 Load16(const uint8_t* p) {
     Bytes16 a;
@@ -83,7 +83,7 @@ inline Sums AddSums(Sums a, Sums b) {
 
 #if defined(__SSE2__) && !defined(FPNAVI_PLAIN_LANES)
 
-// Adds |a - b|. The second of the two partial sums of eight bytes is 0.
+// Adds |a - b|.
 inline Sums AddDiffs(Sums sums, Bytes16 a, Bytes16 b) {
     return sums + reinterpret_cast<Sums>(
                       _mm_sad_epu8(reinterpret_cast<__m128i>(a), reinterpret_cast<__m128i>(b)));
@@ -91,9 +91,9 @@ inline Sums AddDiffs(Sums sums, Bytes16 a, Bytes16 b) {
 inline Sums AddBytes(Sums sums, Bytes16 a) {
     return AddDiffs(sums, a, Bytes16{});
 }
-// The sums of both partial sums of eight bytes: those of a, then those of b.
-inline Quads AddPairs(Sums a, Sums b) {
-    return __builtin_shufflevector(a, b, 0, 2, 4, 6);
+// Adds sums 1 and 3, which are 0 here, to sums 0 and 2. On NEON they become 0.
+inline Sums AddPairs(Sums sums) {
+    return sums;
 }
 // Bit i is the top bit of byte i.
 inline uint32_t TopBits16(Bytes16 a) {
@@ -130,23 +130,26 @@ inline Sums AddBytes(Sums sums, Bytes16 a) {
 inline Sums AddDiffs(Sums sums, Bytes16 a, Bytes16 b) {
     return AddBytes(sums, vabdq_u8(a, b));
 }
+inline Sums AddPairs(Sums sums) {
+    return reinterpret_cast<Sums>(vpaddlq_u32(sums));
+}
 #else
 inline Sums AddBytes(Sums sums, Bytes16 a) {
     for (int32_t i = 0; i < kLanes; ++i)
-        sums[i / 4] += a[i];
+        sums[i / 8 * 2] += a[i];
     return sums;
 }
 inline Sums AddDiffs(Sums sums, Bytes16 a, Bytes16 b) {
     return AddBytes(sums, Excess16(a, b) | Excess16(b, a));
 }
-#endif
-inline Quads AddPairs(Sums a, Sums b) {
-    return __builtin_shufflevector(a, b, 0, 2, 4, 6) + __builtin_shufflevector(a, b, 1, 3, 5, 7);
+inline Sums AddPairs(Sums sums) {
+    return sums;
 }
+#endif
 inline uint32_t TopBits16(Bytes16 a) {
-    const Sums sums = AddBytes(NoSums(), reinterpret_cast<Bytes16>(a > 127) & LaneBits());
-    const Quads halves = AddPairs(sums, sums);
-    return halves[0] | halves[1] << 8;
+    const Bytes16 bits = reinterpret_cast<Bytes16>(a > 127) & LaneBits();
+    const Sums halves = AddPairs(AddBytes(NoSums(), bits));
+    return halves[0] | halves[2] << 8;
 }
 inline Bytes16 Scale16(Bytes16 a, uint32_t factor) {
     for (int32_t i = 0; i < kLanes; ++i)
@@ -162,16 +165,18 @@ inline void StoreBytes(uint8_t* p, Quads a) {
 
 // The sum of all partial sums, which is below 2^31.
 inline int32_t Total(Sums sums) {
-    const Quads halves = AddPairs(sums, sums);
-    return static_cast<int32_t>(halves[0] + halves[1]);
+    const Sums halves = AddPairs(sums);
+    return static_cast<int32_t>(halves[0] + halves[2]);
 }
-// The first two numbers plus the last two: those of a, then those of b.
+// Sums 0 and 1 plus sums 2 and 3: of a, then of b.
 inline Sums AddHalves(Sums a, Sums b) {
     return __builtin_shufflevector(a, b, 0, 1, 4, 5) + __builtin_shufflevector(a, b, 2, 3, 6, 7);
 }
 // The totals of four vectors of partial sums, in their order.
 inline Quads Totals(Sums a, Sums b, Sums c, Sums d) {
-    return AddPairs(AddHalves(a, b), AddHalves(c, d));
+    const Sums ab = AddPairs(AddHalves(a, b));
+    const Sums cd = AddPairs(AddHalves(c, d));
+    return __builtin_shufflevector(ab, cd, 0, 2, 4, 6);
 }
 // Stores a * factor / 2^shift, truncated, as four bytes at p [out]. Every product is below 2^32,
 // every quotient below 256.
