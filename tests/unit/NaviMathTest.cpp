@@ -1,4 +1,4 @@
-// The integer helpers: clamping, wrapping arithmetic, the integer square root.
+// The integer helpers: wrapping arithmetic, the integer square root.
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
@@ -13,15 +13,6 @@ using namespace fpnavi;
 
 constexpr int32_t kMin = std::numeric_limits<int32_t>::min();
 constexpr int32_t kMax = std::numeric_limits<int32_t>::max();
-
-TEST(ClampToGrey, CutsAtBothEnds) {
-    EXPECT_EQ(ClampToGrey(-1), 0);
-    EXPECT_EQ(ClampToGrey(kMin), 0);
-    EXPECT_EQ(ClampToGrey(0), 0);
-    EXPECT_EQ(ClampToGrey(255), 255);
-    EXPECT_EQ(ClampToGrey(256), 255);
-    EXPECT_EQ(ClampToGrey(kMax), 255);
-}
 
 TEST(WrapArithmetic, KeepsTheLow32Bits) {
     EXPECT_EQ(WrapAdd(kMax, 1), kMin);

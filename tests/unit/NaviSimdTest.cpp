@@ -102,10 +102,12 @@ TEST(LaneNumbers, AreTheBytesFrom0To15) {
     EXPECT_EQ(Stored(LaneNumbers()), From(0));
 }
 
-TEST(LoadHalves, LowComesFirstAndNoneReadsOn) {
-    const std::array<uint8_t, 8> low = {1, 2, 3, 4, 5, 6, 7, 8};
-    const std::array<uint8_t, 8> high = {9, 10, 11, 12, 13, 14, 15, 16};
-    EXPECT_EQ(Stored(LoadHalves(low.data(), high.data())), From(1));
+TEST(SpreadBits, LowestSixteenBitsBecomeBytes) {
+    for (uint32_t bits = 0; bits <= 0x2FFFF; ++bits) {
+        const Lanes lanes = Stored(SpreadBits(bits));
+        for (size_t i = 0; i < lanes.size(); ++i)
+            ASSERT_EQ(lanes[i], bits >> i & 1U) << bits << ", byte " << i;
+    }
 }
 
 TEST(TopBits16, TakesTheTopBitOfEachByteAlone) {
@@ -198,20 +200,6 @@ TEST(StoreScaled, EverySumOfUpTo64Greys) {
             const uint8_t expected[5] = {mean, 0, mean, mean, 77};
             ASSERT_TRUE(std::equal(expected, expected + 5, bytes)) << sum << " / " << pixels;
         }
-    }
-}
-
-TEST(SumCounts16, AddsSixteenCounts) {
-    std::mt19937 random(53);
-    for (int32_t round = 0; round < 500; ++round) {
-        int32_t counts[kLanes];
-        int32_t expected = 0;
-        for (int32_t& count : counts) {
-            count = static_cast<int32_t>(random() % (1U << 27));
-            expected += count - (round % 2);
-            count -= round % 2;
-        }
-        ASSERT_EQ(SumCounts16(counts), expected);
     }
 }
 

@@ -17,9 +17,9 @@ inline int32_t WordsOf(int32_t width) {
     return (width + kWordPixels - 1) / kWordPixels;
 }
 
-// The first count bits; 0 <= count <= 64.
+// The first count bits, all from 64 on; count >= 1.
 inline uint64_t FirstBits(int32_t count) {
-    return count >= kWordPixels ? ~uint64_t{0} : (uint64_t{1} << count) - 1;
+    return count < kWordPixels ? ~uint64_t{0} >> (kWordPixels - count) : ~uint64_t{0};
 }
 
 // All bits from first on; 0 <= first < 64. Shifted twice, so that no set bit is shifted out.
@@ -29,8 +29,7 @@ inline uint64_t BitsFrom(int32_t first) {
 
 // The bits from first up to but without last; 0 <= first < last, first < 64.
 inline uint64_t BitsBetween(int32_t first, int32_t last) {
-    const uint64_t all = ~uint64_t{0};
-    return BitsFrom(first) & (last < kWordPixels ? all >> (kWordPixels - last) : all);
+    return BitsFrom(first) & FirstBits(last);
 }
 
 // Bit c is set where row[c] <= value. row [in]: width bytes, 1 <= width <= 64, of which up to 15
@@ -43,27 +42,6 @@ inline uint64_t AtMostBits(const uint8_t* row, int32_t width, uint8_t value) {
         bits |= static_cast<uint64_t>(TopBits16(Equal16(above, Splat16(0)))) << c;
     }
     return bits & FirstBits(width);
-}
-
-// bytes[value][bit] is that bit of value, 0 or 1.
-struct SpreadTable {
-    uint8_t bytes[256][8];
-};
-
-constexpr SpreadTable MakeSpreadTable() {
-    SpreadTable table = {};
-    for (uint32_t value = 0; value < 256; ++value) {
-        for (uint32_t bit = 0; bit < 8; ++bit)
-            table.bytes[value][bit] = static_cast<uint8_t>(value >> bit & 1U);
-    }
-    return table;
-}
-
-inline constexpr SpreadTable kSpreadTable = MakeSpreadTable();
-
-// The lowest sixteen bits as bytes 0 or 1.
-inline Bytes16 SpreadBits(uint64_t bits) {
-    return LoadHalves(kSpreadTable.bytes[bits & 0xFFU], kSpreadTable.bytes[bits >> 8 & 0xFFU]);
 }
 
 }  // namespace fpnavi

@@ -1,9 +1,10 @@
-// Histograms of grey levels and their percentiles. Owns nothing.
+// Sums, histograms and percentiles of grey levels. Owns nothing.
 #ifndef FPNAVI_GREYHISTOGRAM_H
 #define FPNAVI_GREYHISTOGRAM_H
 
 #include <cstdint>
 #include <cstring>
+#include <numeric>
 
 #include "base/NaviSimd.h"
 
@@ -11,6 +12,40 @@ namespace fpnavi {
 
 inline constexpr int32_t kGreyLevels = 256;
 inline constexpr int32_t kBlocksCounted = 4;
+inline constexpr int32_t kMostSummed = 1 << 22;  // bytes: 255 * 2^22 < 2^30
+
+// Sum of a block of a frame: height rows of width bytes, stride bytes apart, at most kMostSummed
+// bytes in all.
+//   frame [in]  the caller's; no byte before it or behind the block's last row is read
+//   first       index in frame of the block's first byte
+// The end of a row is read together with the bytes before it, which are masked; where frame has too
+// few bytes before it, it is copied.
+inline int32_t SumBlock(const uint8_t* frame, int32_t first, int32_t width, int32_t height,
+                        int32_t stride) {
+    const Bytes16 before = FirstBytes(kLanes - width % kLanes);
+    Sums sums = NoSums();
+    for (int32_t row = 0; row < height; ++row) {
+        const uint8_t* p = frame + (first + row * stride);
+        int32_t left = width;
+        for (; left >= 4 * kLanes; left -= 4 * kLanes) {  // the loop costs as much as two of these
+            sums = AddBytes(AddBytes(sums, Load16(p)), Load16(p + kLanes));
+            sums = AddBytes(AddBytes(sums, Load16(p + 2 * kLanes)), Load16(p + 3 * kLanes));
+            p += 4 * kLanes;
+        }
+        for (; left >= kLanes; left -= kLanes) {
+            sums = AddBytes(sums, Load16(p));
+            p += kLanes;
+        }
+        if (p + left - frame >= kLanes) {
+            sums = AddBytes(sums, AndNot16(Load16(p + left - kLanes), before));
+        } else {
+            Bytes16 rest = {};
+            std::memcpy(&rest, p, static_cast<size_t>(left));
+            sums = AddBytes(sums, rest);
+        }
+    }
+    return Total(sums);
+}
 
 // Counts bytes by value. Four histograms: equal neighbours in one table would serialise on
 // store-to-load forwarding.
@@ -36,8 +71,8 @@ class ByteCounter {
     int32_t m_turns[4][kGreyLevels] = {};
 };
 
-// hist [out]: counts of the count bytes at values [in], by value. Not inlined: the
-// counter takes 4 KB of stack, which a caller would keep.
+// hist [out]: counts of the count bytes at values [in], by value. Not inlined: the counter takes
+// 4 KB of stack, which a caller would keep.
 [[gnu::noinline]] inline void CountBytes(const uint8_t* values, int32_t count,
                                          int32_t (&hist)[kGreyLevels]) {
     ByteCounter counter;
@@ -46,22 +81,18 @@ class ByteCounter {
         hist[level] = counter.Of(level);
 }
 
-// Counts the pixels of four blocks that lie side by side, by grey level.
+// Counts the pixels of four blocks that lie side by side, by grey level: one of each block in turn,
+// for the same reason.
 //   greys [in]  first pixel of the first block; blocks have height rows of width pixels, rows are
 //               stride bytes apart
 //   hist [out]  hist[b][grey]: pixels of block b
-// One pixel of each block in turn: equal neighbours in one table would serialise on store-to-load
-// forwarding.
 inline void CountFourBlocks(const uint8_t* greys, int32_t width, int32_t height, int32_t stride,
                             int32_t (&hist)[kBlocksCounted][kGreyLevels]) {
     std::memset(hist, 0, sizeof hist);
-    for (int32_t row = 0; row < height; ++row) {
-        const uint8_t* const pixels = greys + row * stride;
+    for (int32_t row = 0; row < height; ++row, greys += stride) {
         for (int32_t i = 0; i < width; ++i) {
-            ++hist[0][pixels[i]];
-            ++hist[1][pixels[width + i]];
-            ++hist[2][pixels[2 * width + i]];
-            ++hist[3][pixels[3 * width + i]];
+            for (int32_t b = 0; b < kBlocksCounted; ++b)
+                ++hist[b][greys[b * width + i]];
         }
     }
 }
@@ -99,7 +130,7 @@ inline LevelPair FirstLevelsAbove(const int32_t* hist, int32_t lowLimit, int32_t
     for (; group.first < kGreyLevels; group.first += kLanes) {
         low = group.below <= lowLimit ? group : low;
         high = group.below <= highLimit ? group : high;
-        group.below += SumCounts16(hist + group.first);
+        group.below += std::accumulate(hist + group.first, hist + group.first + kLanes, 0);
     }
     return {LevelAbove(hist, low, lowLimit), LevelAbove(hist, high, highLimit)};
 }

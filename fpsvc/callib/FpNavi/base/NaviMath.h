@@ -1,5 +1,5 @@
-// Integer helpers of the module: clamping, the named arithmetic that may wrap, and the
-// integer square root. Everything else in the module is shown not to overflow. Owns nothing.
+// Integer helpers of the module: the named arithmetic that may wrap and the integer square root.
+// Everything else in the module is shown not to overflow. Owns nothing.
 //
 // The Wrap functions compute in 64 bits and keep the low 32, that is two's complement arithmetic.
 #ifndef FPNAVI_NAVIMATH_H
@@ -10,10 +10,6 @@
 namespace fpnavi {
 
 inline constexpr int32_t kGreyMax = 255;  // largest 8-bit grey level
-
-inline uint8_t ClampToGrey(int32_t value) {
-    return static_cast<uint8_t>(value < 0 ? 0 : (value > kGreyMax ? kGreyMax : value));
-}
 
 inline int32_t Wrap(int64_t value) {
     return static_cast<int32_t>(value);
@@ -58,8 +54,6 @@ inline uint32_t WrapMulU(uint32_t a, uint32_t b) {
 // x < 0. Deliberate: from 2^30 on the squares wrap and the result is whatever the steps give (2^30
 // gives 65537). The fp vote reaches that for a pair displaced by 328 pixels or more.
 inline int32_t IntSqrt(int32_t x) {
-    if (x == 0)
-        return 0;
     int32_t bits = 0;  // of the root; at most 16
     for (int32_t rest = x; rest > 0; rest >>= 2)
         ++bits;

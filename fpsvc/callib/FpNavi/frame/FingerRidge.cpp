@@ -96,7 +96,7 @@ void GetFingerRidge(NaviFrame_t* img, int32_t thr) {
     const Rows rows = {room, room + img->height * words, words, img->height};
     // No grey is below 0, and none above 255.
     if (thr >= 0)
-        MarkDark(*img, ClampToGrey(thr), rows);
+        MarkDark(*img, static_cast<uint8_t>(std::min(thr, kGreyMax)), rows);
     else
         std::fill_n(rows.bits, img->height * words, uint64_t{0});
     for (int32_t pass = 0; pass < kPasses; ++pass) {

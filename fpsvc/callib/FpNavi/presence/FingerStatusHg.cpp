@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "base/ByteSums.h"
+#include "base/GreyHistogram.h"
 #include "base/NaviMath.h"
 #include "param/NaviMode.h"
 #include "param/NaviParam.h"
