@@ -5,7 +5,6 @@
 #include "gesture/NaviVoteInfo.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace host {

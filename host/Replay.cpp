@@ -9,7 +9,6 @@
 #include "ParamTable.h"
 #include "Store.h"
 #include "gesture/NaviVoteInfo.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace host {

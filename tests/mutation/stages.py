@@ -16,8 +16,8 @@ _TESTED_IN = {
     'PlacementScores': 'FindCandidate', 'CandidateHeap': 'FindCandidate',
     'CandidateSearch': 'FindCandidate', 'DisplacementScore': 'ImgJoint', 'MatchSearch': 'ImgJoint',
     'PairMatch': 'ImgJoint', 'TuneMeasure': 'Tune', 'TuneRegisters': 'Tune',
-    'WordLanes': 'FingerDetect', 'SetNaviParam': 'NaviParam', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
-    'NaviVoteInfo': 'Gesture', 'NaviMode': 'NaviParam',
+    'WordLanes': 'FingerDetect', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
+    'NaviVoteInfo': 'Gesture',
 }
 # Files that the step tests do not call.
 _NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneHistogram',

@@ -12,7 +12,6 @@
 #include "motion/DoubleScan.h"
 #include "motion/FingerNoMove.h"
 #include "param/NaviLimits.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

@@ -8,7 +8,6 @@
 #include "frame/NaviFrame.h"
 #include "gesture/NaviVoteInfo.h"
 #include "matching/MatchSearch.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

@@ -13,7 +13,6 @@
 #include "base/NaviSimd.h"
 #include "frame/NaviFrame.h"
 #include "gesture/NaviVoteInfo.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

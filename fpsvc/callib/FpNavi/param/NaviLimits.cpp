@@ -10,7 +10,6 @@
 #include <algorithm>
 #include <cstdint>
 
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

@@ -5,7 +5,6 @@
 #include "gesture/Gesture.h"
 #include "motion/DoubleScan.h"
 #include "param/NaviLimits.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "presence/FingerStatusFp.h"
 #include "presence/FingerStatusHg.h"

@@ -4,7 +4,6 @@
 
 #include "base/ByteSums.h"
 #include "base/NaviMath.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

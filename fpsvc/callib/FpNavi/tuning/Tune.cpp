@@ -6,7 +6,6 @@
 
 #include "base/NaviMath.h"
 #include "gesture/Gesture.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "tuning/TuneMeasure.h"
 #include "tuning/TuneRegisters.h"

@@ -1,7 +1,6 @@
 // Voting: when a vote is due, which mode votes, and what the host's settings make of the key.
 #include "base/NaviLog.h"
 #include "gesture/Gesture.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "vote/VotingFp.h"
 #include "vote/VotingHg.h"

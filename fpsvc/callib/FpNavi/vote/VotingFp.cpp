@@ -7,7 +7,6 @@
 #include "base/NaviMath.h"
 #include "gesture/Gesture.h"
 #include "gesture/NaviVoteInfo.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "vote/VoteInfoLog.h"
 
