@@ -2,7 +2,6 @@
 
 #include "frame/NaviFrame.h"
 #include "gesture/Gesture.h"
-#include "gesture/NaviVoteInfo.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
 #include "param/NaviParam.h"

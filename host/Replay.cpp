@@ -8,7 +8,7 @@
 #include "Keys.h"
 #include "ParamTable.h"
 #include "Store.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "param/NaviParam.h"
 
 namespace host {

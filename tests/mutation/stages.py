@@ -17,7 +17,6 @@ _TESTED_IN = {
     'CandidateSearch': 'FindCandidate', 'DisplacementScore': 'ImgJoint', 'MatchSearch': 'ImgJoint',
     'PairMatch': 'ImgJoint', 'TuneMeasure': 'Tune', 'TuneRegisters': 'Tune',
     'WordLanes': 'FingerDetect', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
-    'NaviVoteInfo': 'Gesture',
 }
 # Files that the step tests do not call.
 _NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneHistogram',

@@ -11,7 +11,7 @@
 #include "Twin.h"
 #include "alog_host.h"
 #include "frame/NaviFrame.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
 #include "param/NaviParam.h"

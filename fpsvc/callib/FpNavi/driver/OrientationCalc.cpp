@@ -1,12 +1,13 @@
 #include "driver/OrientationCalc.h"
 
+#include <cstring>
+
 #include "base/NaviLog.h"
 #include "base/NaviMath.h"
 #include "frame/FramePair.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
 #include "gesture/Gesture.h"
-#include "gesture/NaviVoteInfo.h"
 #include "matching/PairMatch.h"
 #include "motion/CenterMove.h"
 #include "motion/DoubleScan.h"
@@ -17,23 +18,19 @@
 namespace fpnavi {
 namespace {
 
-constexpr int32_t kPairMax = FPNAVI_VOTE_CAPACITY - 1;  // entry n + 1 of the last pair must fit
-
-// Loads and pre-processes the whole image at data into s_imageCurr.
-int32_t LoadFrame(const uint8_t* data) {
-    if (ImgInit(&s_imageCurr, 0, s_imageHeight, 0, s_imageWidth, data) != 0)
-        return -1;
-    return ImgPreProcess(&s_imageCurr);
-}
-
-// The current frame becomes the previous one, data the current one, and the pair is evaluated.
+// The current frame becomes the previous one, unless it is the gesture's first, and data the
+// current one. Evaluates the pair.
 int32_t NextFrame(const uint8_t* data) {
-    if (ImgCopy(&s_imagePrev, &s_imageCurr) != 0)
+    const bool first = s_frameNum == 1;
+    if (!first) {
+        if (ImgCopy(&s_imagePrev, &s_imageCurr) != 0)
+            return -1;
+        ImgClear(&s_imageCurr);
+    }
+    if (ImgInit(&s_imageCurr, 0, s_imageHeight, 0, s_imageWidth, data) != 0 ||
+        ImgPreProcess(&s_imageCurr) != 0)
         return -1;
-    ImgClear(&s_imageCurr);
-    if (LoadFrame(data) != 0)
-        return -1;
-    return OrntCalcProcess();
+    return first ? 0 : OrntCalcProcess();
 }
 
 // A frame starts with measures of 0, and only GetCenterAndCoverage changes them. So a frame whose
@@ -70,12 +67,6 @@ void RecordRest(int32_t n) {
     }
 }
 
-void RecordFingerprint(int32_t n, int32_t vkey) {
-    s_voteInfo.vkey_fp[n] = vkey;
-    s_voteInfo.dx_fp[n] = 0;
-    s_voteInfo.dy_fp[n] = 0;
-}
-
 // The fingerprint methods of the fp modes, cheapest first.
 int32_t CompareFingerprints(int32_t n) {
     if (!AreComparable(&s_imagePrev, &s_imageCurr))
@@ -84,10 +75,13 @@ int32_t CompareFingerprints(int32_t n) {
     const int32_t outcome = TestNoMove(pair.prev, pair.curr, CurrentNoMoveLimits());
     if (outcome == kNoMoveMoved)
         return CoversLess(s_coverageMinFp) ? 0 : MatchPair(pair);
-    const bool resting = outcome == kNoMoveResting;
-    RecordFingerprint(n, resting ? VKEY_NO_MOVE : VKEY_NONE);
-    if (resting)
+    s_voteInfo.vkey_fp[n] = VKEY_NONE;
+    s_voteInfo.dx_fp[n] = 0;
+    s_voteInfo.dy_fp[n] = 0;
+    if (outcome == kNoMoveResting) {
+        s_voteInfo.vkey_fp[n] = VKEY_NO_MOVE;
         RecordRest(n);
+    }
     return 0;
 }
 
@@ -95,7 +89,7 @@ int32_t CompareFingerprints(int32_t n) {
 
 int32_t OrntCalcProcess() {
     const int32_t n = PairCount(s_voteInfo);
-    if (n >= kPairMax)
+    if (n == kPairCountMax)
         return 0;
     if (!IsHg() && !PairWorkAcceptable())
         return -1;
@@ -131,13 +125,23 @@ int32_t OrientationCalc(const uint8_t* data_prev, const uint8_t* data_curr, int3
     if (FingerLifted() || time_out == 1)
         return 0;
     s_frameNum = WrapAdd(s_frameNum, 1);
-    int32_t result = -1;
-    if (GestureGeometryUsable())
-        result = s_frameNum == 1 ? LoadFrame(data_curr) : NextFrame(data_curr);
+    const int32_t result = GestureGeometryUsable() ? NextFrame(data_curr) : -1;
     // A failed frame leaves both empty, so that all further frames of the gesture fail too.
     if (result != 0) {
         ImgClear(&s_imageCurr);
         ImgClear(&s_imagePrev);
     }
     return result;
+}
+
+void FpNaviClear() {
+    using namespace fpnavi;
+    s_lastFrameFlag = 0;
+    s_tuneOkFlag = 0;
+    s_frameNum = 0;
+    std::memset(DoubleScanZonePrev, 0, sizeof DoubleScanZonePrev);
+    std::memset(DoubleScanZoneCurr, 0, sizeof DoubleScanZoneCurr);
+    VoteInfoClear(&s_voteInfo);
+    for (auto* img : {&s_imageCurr, &s_imagePrev, &s_fullImageCurr, &s_fullImagePrev})
+        ImgClear(img);
 }

@@ -6,7 +6,7 @@
 #include "base/NaviMath.h"
 #include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "matching/MatchSearch.h"
 #include "param/NaviParam.h"
 

@@ -1,10 +1,9 @@
-#include "vote/VotingHg.h"
-
 #include <algorithm>
 
 #include "base/NaviMath.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "param/NaviParam.h"
+#include "vote/Voting.h"
 
 namespace fpnavi {
 namespace {
@@ -60,11 +59,11 @@ int32_t VoteAlong(const Axis& axis, const VerdictCounts& counts) {
     // A centroid that crossed the middle has moved, whatever the verdicts of single pairs are.
     if (WrapMul(axis.first, axis.last) < 0)
         return total > 0 ? axis.positive : axis.negative;
+    if (!CountsSuffice(counts))
+        return VKEY_NO_MOVE;
     if (CountsFavour(counts, axis, axis.positive, axis.negative))
-        return CountsSuffice(counts) ? axis.positive : VKEY_NO_MOVE;
-    if (CountsFavour(counts, axis, axis.negative, axis.positive))
-        return CountsSuffice(counts) ? axis.negative : VKEY_NO_MOVE;
-    return VKEY_NO_MOVE;
+        return axis.positive;
+    return CountsFavour(counts, axis, axis.negative, axis.positive) ? axis.negative : VKEY_NO_MOVE;
 }
 
 }  // namespace
