@@ -19,8 +19,8 @@ _TESTED_IN = {
     'WordLanes': 'FingerDetect', 'VoteInfoLog': 'Voting', 'alog_host': 'Log', 'NaviLog': 'Log',
 }
 # Files that the step tests do not call.
-_NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneHistogram',
-             'TuneMeasure', 'TuneRegisters', 'NaviBlock', 'alog_host'}
+_NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneMeasure',
+             'TuneRegisters', 'NaviBlock', 'alog_host'}
 _COMPARED = {'FPNAVI_COMPARE_GESTURES': '200', 'FPNAVI_HOSTILE_BLOCKS': '60'}
 _MEMORY = 1 << 30  # bytes a test may take; the largest takes a tenth
 _OUTPUT = 1 << 24  # bytes it may print
