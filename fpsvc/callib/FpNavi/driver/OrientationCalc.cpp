@@ -43,15 +43,6 @@ bool CoversLess(int32_t coverage) {
     return s_imagePrev.cvr < coverage || s_imageCurr.cvr < coverage;
 }
 
-void RecordCenters(int32_t n) {
-    s_voteInfo.xc[n] = s_imagePrev.xc;
-    s_voteInfo.yc[n] = s_imagePrev.yc;
-    s_voteInfo.xc[n + 1] = s_imageCurr.xc;
-    s_voteInfo.yc[n + 1] = s_imageCurr.yc;
-    s_voteInfo.cvr[n] = s_imagePrev.cvr;
-    s_voteInfo.cvr[n + 1] = s_imageCurr.cvr;
-}
-
 // The finger rests: the centroid moved only because the contact changed. Both frames of the pair
 // get the centroid of the frame that shows more finger, the previous one on a tie.
 void RecordRest(int32_t n) {
@@ -103,7 +94,12 @@ int32_t OrntCalcProcess() {
     if (CoversLess(s_coverageMinEff))
         return 0;
     CalcCenterMove(&s_imagePrev, &s_imageCurr, &s_voteInfo);
-    RecordCenters(n);
+    s_voteInfo.xc[n] = s_imagePrev.xc;
+    s_voteInfo.yc[n] = s_imagePrev.yc;
+    s_voteInfo.cvr[n] = s_imagePrev.cvr;
+    s_voteInfo.xc[n + 1] = s_imageCurr.xc;
+    s_voteInfo.yc[n + 1] = s_imageCurr.yc;
+    s_voteInfo.cvr[n + 1] = s_imageCurr.cvr;
     if (IsHg()) {
         if (s_voteInfo.vkey_ct[n] == VKEY_NO_MOVE)
             RecordRest(n);

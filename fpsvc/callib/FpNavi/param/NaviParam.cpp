@@ -7,7 +7,13 @@
 namespace fpnavi {
 namespace {
 
-void DeriveBlockGeometry() {
+// Length of a full image's side: the centre, and where there are tiles also on both sides a border
+// tile and a gap.
+int32_t FullSide(int32_t center, int32_t gap, int32_t bound) {
+    return IsTiled() ? WrapAdd(center, WrapMul(2, WrapAdd(gap, bound))) : center;
+}
+
+void DeriveGeometry() {
     const bool hg = IsHg();
     s_blockWidth = hg ? s_blockWidthHg : s_blockWidthFp;
     s_blockHeight = hg ? s_blockHeightHg : s_blockHeightFp;
@@ -18,19 +24,9 @@ void DeriveBlockGeometry() {
         s_doubleScanFlag = 1;
     s_imageHeight = WrapMul(s_blockRowNum, s_blockHeight);
     s_imageWidth = WrapMul(s_blockColNum, s_blockWidth);
-}
-
-// Length of a full image's side: the centre, and on both sides a border tile and a gap.
-int32_t FullSide(int32_t center, int32_t gap, int32_t bound) {
-    return WrapAdd(center, WrapMul(2, WrapAdd(gap, bound)));
-}
-
-void DeriveMatchGeometry() {
-    const bool tiled = IsTiled();
-    s_fullImageHeight =
-        tiled ? FullSide(s_centerHeight, s_gapHeight, s_boundHeight) : s_centerHeight;
-    s_fullImageWidth = tiled ? FullSide(s_centerWidth, s_gapWidth, s_boundWidth) : s_centerWidth;
-    s_tpltNum = tiled ? 8 : 4;
+    s_fullImageHeight = FullSide(s_centerHeight, s_gapHeight, s_boundHeight);
+    s_fullImageWidth = FullSide(s_centerWidth, s_gapWidth, s_boundWidth);
+    s_tpltNum = IsTiled() ? 8 : 4;
     s_tpltHeightUD = s_templateHeight;
     s_tpltWidthLR = s_templateHeight;
     s_tpltWidthUD = s_templateWidth;
@@ -45,8 +41,7 @@ int32_t SetNaviParam(const int32_t* params) {
     if (params == nullptr)
         return -1;
     std::memcpy(static_cast<void*>(&s_naviParams), params, sizeof s_naviParams);
-    DeriveBlockGeometry();
-    DeriveMatchGeometry();
+    DeriveGeometry();
     // Every second row only is scanned: what counts rows of the sensor is halved.
     if (IsDownSampled()) {
         s_sensorHeight /= 2;

@@ -23,16 +23,13 @@ constexpr char kFunction[] = "Voting_fp_mode";
 void LogVoteInfo() {
     const NaviVoteInfo_t& info = s_voteInfo;
     const int32_t n = PairCount(info);
-    NAVI_LOG(kFunction, 508,
-             "##################### Vote information ########################\n");
+    NAVI_LOG(kFunction, 508, "##################### Vote information ########################\n");
     NAVI_LOG(kFunction, 510, "calculate count = %d\n", n);
-    NAVI_LOG(kFunction, 512,
-             "Initial and final centroid position are (%d, %d) and (%d, %d).\n", info.xc[0],
-             info.yc[0], info.xc[n], info.yc[n]);
+    NAVI_LOG(kFunction, 512, "Initial and final centroid position are (%d, %d) and (%d, %d).\n",
+             info.xc[0], info.yc[0], info.xc[n], info.yc[n]);
     NAVI_LOG(kFunction, 516, "Centroid method result array are:\n" TEN_FORMATS,
              ELEVEN(info.vkey_ct));
-    NAVI_LOG(kFunction, 521,
-             "Centroid results (dx, dy) array are:\n" ELEVEN_PAIR_FORMATS "}\n",
+    NAVI_LOG(kFunction, 521, "Centroid results (dx, dy) array are:\n" ELEVEN_PAIR_FORMATS "}\n",
              ELEVEN_PAIRS(info.dx_ct, info.dy_ct));
     NAVI_LOG(kFunction, 523,
              "Initial and final centroid position of hardware navigation are (%d, %d) and "
@@ -44,8 +41,7 @@ void LogVoteInfo() {
              ELEVEN_PAIRS(info.dx_ds, info.dy_ds));
     NAVI_LOG(kFunction, 532, "Fingerprint match result array are:\n" TEN_FORMATS,
              ELEVEN(info.vkey_fp));
-    NAVI_LOG(kFunction, 537,
-             "Fingerprint results (dx, dy) array are:\n" ELEVEN_PAIR_FORMATS " }\n",
+    NAVI_LOG(kFunction, 537, "Fingerprint results (dx, dy) array are:\n" ELEVEN_PAIR_FORMATS " }\n",
              ELEVEN_PAIRS(info.dx_fp, info.dy_fp));
     NAVI_LOG(kFunction, 541, "Fingerprint diff array are:\n" TEN_FORMATS, ELEVEN(info.diff));
 }

@@ -93,35 +93,14 @@ std::optional<Tally> TallyPairs() {
 // The key of the largest mixed score of both methods; of equal ones the last.
 int32_t ChooseKey(const Tally& tally) {
     int32_t score[4];
-    for (int32_t d = 0; d < 4; ++d) {
+    for (int32_t d = 0; d < 4; ++d)
         score[d] =
             WrapAdd(WrapMul(s_fpImp, tally.method_fp[d]), WrapMul(s_ctImp, tally.method_ct[d])) /
             precision_times;
-    }
     const auto [least, most] = std::minmax_element(std::begin(score), std::end(score));
     if (*least == *most && MayAnswerNone())
         return VKEY_NONE;
     return VKEY_UP + static_cast<int32_t>(most - score);
-}
-
-// What the distances alone decide: a key, or empty when the scores have to.
-std::optional<int32_t> JudgeDistances(const Tally& tally, int32_t ct_final_distance,
-                                      int32_t fp_final_distance) {
-    const int32_t calc_cnt = PairCount(s_voteInfo);
-    const bool anyRest = tally.count_of_diff_result != 0;
-    const bool hardlyMoved =
-        ct_final_distance < s_ct_none_threshold && ct_final_distance > 0 && fp_final_distance == 0;
-    if (hardlyMoved && !anyRest && MayAnswerNone())
-        return VKEY_NONE;
-    if (anyRest && fp_final_distance <= s_fpMoveThreshold &&
-        ct_final_distance <= s_ct_not_move_threshold)
-        return VKEY_NO_MOVE;
-    const int32_t final_ct_and_fp = WrapAdd(ct_final_distance, fp_final_distance);
-    const bool oneMovingPair = calc_cnt - tally.count_of_diff_result <= 1;
-    if (calc_cnt == 0 || final_ct_and_fp <= s_totalMoveThreshold ||
-        (oneMovingPair && s_directionControlFlag == kDirectionVertical))
-        return VKEY_NO_MOVE;
-    return std::nullopt;
 }
 
 }  // namespace
@@ -132,15 +111,24 @@ int32_t Voting_fp_mode() {
     const std::optional<Tally> tally = TallyPairs();
     if (!tally)
         return -1;
+    const int32_t calc_cnt = PairCount(s_voteInfo);
+    const int32_t rest_cnt = tally->count_of_diff_result;
     const int32_t ct_final_distance = IntSqrt(SquaredLength(tally->sumCt));
     const int32_t fp_final_distance = IntSqrt(SquaredLength(tally->sumFp));
-    if (const auto decided = JudgeDistances(*tally, ct_final_distance, fp_final_distance))
-        return *decided;
-    // The finger is still down after a short way: a long press.
-    if (!FingerLifted() && ct_final_distance < s_totalMoveThresholdLongpressCt &&
-        fp_final_distance < s_totalMoveThresholdLongpressFp)
-        return VKEY_NO_MOVE;
-    return ChooseKey(*tally);
+    const bool hardlyMoved =
+        ct_final_distance < s_ct_none_threshold && ct_final_distance > 0 && fp_final_distance == 0;
+    if (hardlyMoved && rest_cnt == 0 && MayAnswerNone())
+        return VKEY_NONE;
+    const bool rested = rest_cnt != 0 && fp_final_distance <= s_fpMoveThreshold &&
+                        ct_final_distance <= s_ct_not_move_threshold;
+    const bool tooShort =
+        calc_cnt == 0 || WrapAdd(ct_final_distance, fp_final_distance) <= s_totalMoveThreshold;
+    const bool oneMovingPair =
+        calc_cnt - rest_cnt <= 1 && s_directionControlFlag == kDirectionVertical;
+    // The finger is still down after a short way.
+    const bool longPress = !FingerLifted() && ct_final_distance < s_totalMoveThresholdLongpressCt &&
+                           fp_final_distance < s_totalMoveThresholdLongpressFp;
+    return rested || tooShort || oneMovingPair || longPress ? VKEY_NO_MOVE : ChooseKey(*tally);
 }
 
 }  // namespace fpnavi
