@@ -44,12 +44,8 @@ bool IsComplete() {
 }  // namespace
 
 int32_t _NAVI_ImgHistogram(const uint8_t* img, int32_t height, int32_t width) {
-    const std::optional<CornerGreys> corner = MeasureCorner(img, height, width);
     s_reading.mean = 0;
-    if (!corner)
-        return -1;
-    static_cast<CornerGreys&>(s_reading) = *corner;
-    return 0;
+    return MeasureCorner(img, height, width, &s_reading) ? 0 : -1;
 }
 
 void _NAVI_GetDelta() {

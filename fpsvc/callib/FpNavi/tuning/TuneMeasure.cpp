@@ -80,7 +80,8 @@ void _NAVI_SortIndex(int32_t* fValue, int32_t* iIndex, int32_t len) {
     }
 }
 
-int32_t _NAVI_CalcTop(uint32_t X, uint32_t Y, const uint32_t* histogram) {
+// Not inlined: clang would make longer loops of it in MeasureFrame.
+[[gnu::noinline]] int32_t _NAVI_CalcTop(uint32_t X, uint32_t Y, const uint32_t* histogram) {
     uint32_t img_count = 0;
     for (int32_t index = 0; index <= kGreyMax; ++index)
         img_count = WrapAddU(img_count, histogram[index]);
@@ -93,10 +94,10 @@ int32_t _NAVI_CalcTop(uint32_t X, uint32_t Y, const uint32_t* histogram) {
     return WrapDiv(WrapSub(i_top_Y, i_top_X), WrapSub(i_threshold_Y, i_threshold_X));
 }
 
-std::optional<CornerGreys> MeasureCorner(const uint8_t* img, int32_t height, int32_t width) {
+bool MeasureCorner(const uint8_t* img, int32_t height, int32_t width, CornerGreys* corner) {
     if (!ImageDividable(height, width)) {
         NAVI_LOG("_NAVI_ImgHistogram", 1590, "error! size cannot be divided by 16!\n");
-        return std::nullopt;
+        return false;
     }
     const int32_t right = static_cast<int32_t>(3 * int64_t{width} / 4);
     const int32_t bottom = static_cast<int32_t>(3 * int64_t{height} / 4);
@@ -114,10 +115,10 @@ std::optional<CornerGreys> MeasureCorner(const uint8_t* img, int32_t height, int
     int32_t blk_origin_order[kCornerNum] = {0, 1, 2, 3};
     _NAVI_SortIndex(blk_mean, blk_origin_order, kCornerNum);
     const int32_t rank = _NAVI_blk_selection_mode;
-    CornerGreys corner = {static_cast<uint32_t>(blk_mean[rank]), {}};
+    *corner = {static_cast<uint32_t>(blk_mean[rank]), {}};
     ForEachPixel(img, width, Blk_Nodes[blk_origin_order[rank]],
-                 [&corner](uint8_t grey) { ++corner.histogram[grey]; });
-    return corner;
+                 [corner](uint8_t grey) { ++corner->histogram[grey]; });
+    return true;
 }
 
 std::optional<GreyReading> MeasureFrame(const uint8_t* img, const _NAVI_SIZE& size,
@@ -125,16 +126,16 @@ std::optional<GreyReading> MeasureFrame(const uint8_t* img, const _NAVI_SIZE& si
     // An image of the wrong size reads no table, and is reported as such.
     if (ImageDividable(size.iHeight, size.iWidth) && !FrameUsable(size, gainCode))
         return std::nullopt;
-    const std::optional<CornerGreys> corner = MeasureCorner(img, size.iHeight, size.iWidth);
-    if (!corner)
+    GreyReading reading = {};
+    if (!MeasureCorner(img, size.iHeight, size.iWidth, &reading))
         return std::nullopt;
-    GreyReading reading = {*corner, 0, 0, 0, 0, 0, gainCode, 0};
     reading.top = static_cast<uint32_t>(_NAVI_CalcTop(
-        _NAVI_top_mean_interval.RANGE_LOW, _NAVI_top_mean_interval.RANGE_HIGH, corner->histogram));
+        _NAVI_top_mean_interval.RANGE_LOW, _NAVI_top_mean_interval.RANGE_HIGH, reading.histogram));
     reading.effective = Classify(reading.mean, _NAVI_range_mean);
     reading.recommend = Classify(reading.mean, _NAVI_range_mean_recommend);
     reading.recommendTop = Classify(reading.top, _NAVI_range_recommend);
     reading.nonLinear = Saturated(reading.mean) && Saturated(reading.top) ? 1 : 0;
+    reading.gainCode = gainCode;
     reading.gainFactor = static_cast<uint32_t>(_NAVI_K_CALC(gainCode));
     return reading;
 }

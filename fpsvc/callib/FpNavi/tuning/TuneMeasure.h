@@ -31,9 +31,10 @@ struct GreyReading : CornerGreys {
 };
 
 // Measures the corner block of the image (height rows of width bytes, the caller's) whose mean has
-// the rank _NAVI_blk_selection_mode, 0 the darkest to 3. Empty, with a log line, when the image
-// cannot be divided by 16; height and width are positive and their product fits 32 bits otherwise.
-std::optional<CornerGreys> MeasureCorner(const uint8_t* img, int32_t height, int32_t width);
+// the rank _NAVI_blk_selection_mode, 0 the darkest to 3. Returns false, with a log line and corner
+// [out] left as it was, when the image cannot be divided by 16; height and width are positive and
+// their product fits 32 bits otherwise.
+bool MeasureCorner(const uint8_t* img, int32_t height, int32_t width, CornerGreys* corner);
 
 // Measures the frame img [in] of the given size (row by row, the caller's), taken at the packed
 // gain code. Empty when it cannot be measured: its pixels are no multiple of 16, which is logged
