@@ -12,7 +12,7 @@
 #include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "matching/CandidateSearch.h"
 #include "matching/PairMatch.h"
 #include "motion/CenterMove.h"

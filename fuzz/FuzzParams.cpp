@@ -3,7 +3,6 @@
 #include <limits>
 #include <string>
 
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi_fuzz {

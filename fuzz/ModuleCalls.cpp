@@ -11,7 +11,6 @@
 #include "FuzzParams.h"
 #include "alog_host.h"
 #include "param/NaviLimits.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace {

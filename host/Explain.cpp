@@ -2,10 +2,8 @@
 
 #include "frame/NaviFrame.h"
 #include "gesture/Gesture.h"
-#include "gesture/NaviVoteInfo.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace host {

@@ -8,8 +8,7 @@
 #include "Keys.h"
 #include "ParamTable.h"
 #include "Store.h"
-#include "gesture/NaviVoteInfo.h"
-#include "param/NaviMode.h"
+#include "gesture/Gesture.h"
 #include "param/NaviParam.h"
 
 namespace host {

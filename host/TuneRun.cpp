@@ -5,7 +5,6 @@
 
 #include "Error.h"
 #include "FpNavi.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 #include "tuning/Tune.h"
 

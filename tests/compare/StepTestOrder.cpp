@@ -9,7 +9,7 @@
 #include "driver/OrientationCalc.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "matching/PairMatch.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"

@@ -8,8 +8,7 @@
 #include "StepTestPair.h"
 #include "Twin.h"
 #include "gesture/Gesture.h"
-#include "presence/FingerStatusFp.h"
-#include "presence/FingerStatusHg.h"
+#include "presence/FingerStatus.h"
 
 namespace fpnavi_test {
 namespace {

@@ -18,7 +18,7 @@
 #include "ParamTable.h"
 #include "PresenceFrames.h"
 #include "param/NaviParam.h"
-#include "presence/FingerStatusFp.h"
+#include "presence/FingerStatus.h"
 
 namespace {
 

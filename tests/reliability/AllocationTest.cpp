@@ -16,7 +16,7 @@
 #include "SmallGesture.h"
 #include "Twin.h"
 #include "frame/NaviFrame.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 
 namespace fpnavi_test {
 namespace {

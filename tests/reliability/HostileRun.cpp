@@ -11,10 +11,9 @@
 #include "Twin.h"
 #include "alog_host.h"
 #include "frame/NaviFrame.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "motion/CenterMove.h"
 #include "motion/FingerNoMove.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi_test {

@@ -13,7 +13,6 @@
 #include "MsanGestures.h"
 #include "ParamTable.h"
 #include "alog_host.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace {

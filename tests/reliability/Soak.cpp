@@ -12,7 +12,7 @@
 
 #include "FailingMalloc.h"
 #include "SmallGesture.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 
 namespace {
 

@@ -10,7 +10,7 @@
 #include "gesture/Gesture.h"
 #include "motion/DoubleScan.h"
 #include "param/NaviParam.h"
-#include "vote/VotingFp.h"
+#include "vote/Voting.h"
 
 namespace {
 

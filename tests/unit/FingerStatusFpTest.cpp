@@ -4,7 +4,7 @@
 #include <vector>
 
 #include "Fixtures.h"
-#include "presence/FingerStatusFp.h"
+#include "presence/FingerStatus.h"
 
 namespace {
 

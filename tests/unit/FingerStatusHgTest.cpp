@@ -4,7 +4,7 @@
 #include <vector>
 
 #include "Fixtures.h"
-#include "presence/FingerStatusHg.h"
+#include "presence/FingerStatus.h"
 
 namespace {
 

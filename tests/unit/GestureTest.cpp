@@ -8,7 +8,6 @@
 #include "Fixtures.h"
 #include "frame/NaviFrame.h"
 #include "gesture/Gesture.h"
-#include "gesture/NaviVoteInfo.h"
 #include "motion/DoubleScan.h"
 #include "param/NaviParam.h"
 

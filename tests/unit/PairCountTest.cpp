@@ -9,7 +9,7 @@
 #include "Fixtures.h"
 #include "LogCapture.h"
 #include "frame/NaviFrame.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "matching/PairMatch.h"
 #include "motion/CenterMove.h"
 #include "motion/DoubleScan.h"

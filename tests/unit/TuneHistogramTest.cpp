@@ -9,7 +9,7 @@
 
 #include "LogCapture.h"
 #include "TuneTestSupport.h"
-#include "tuning/TuneHistogram.h"
+#include "tuning/TuneMeasure.h"
 
 namespace {
 

@@ -29,16 +29,15 @@ TEST_F(TuneValues, MeasuringReturnsWhatTheFrameShowsAndChangesNoState) {
     const std::vector<uint32_t> before = TuneState();
     const auto measured = MeasureFrame(Flat(230).data(), kSize, kRefGainCode);
     ASSERT_TRUE(measured);
-    EXPECT_EQ(measured->reading.mean, 230U);
-    EXPECT_EQ(measured->reading.top, 230U);
-    EXPECT_EQ(measured->reading.effective, 1);
-    EXPECT_EQ(measured->reading.recommend, 1);
-    EXPECT_EQ(measured->reading.recommendTop, 1);
-    EXPECT_EQ(measured->reading.nonLinear, 0);
-    EXPECT_EQ(measured->reading.gainCode, kRefGainCode);
-    EXPECT_EQ(measured->reading.gainFactor, 374U);
-    EXPECT_EQ(measured->corner.mean, 230);
-    EXPECT_EQ(measured->corner.histogram[230], 126U);
+    EXPECT_EQ(measured->mean, 230U);
+    EXPECT_EQ(measured->top, 230U);
+    EXPECT_EQ(measured->effective, 1);
+    EXPECT_EQ(measured->recommend, 1);
+    EXPECT_EQ(measured->recommendTop, 1);
+    EXPECT_EQ(measured->nonLinear, 0);
+    EXPECT_EQ(measured->gainCode, kRefGainCode);
+    EXPECT_EQ(measured->gainFactor, 374U);
+    EXPECT_EQ(measured->histogram[230], 126U);
     EXPECT_EQ(TuneState(), before);
 }
 

@@ -3,7 +3,7 @@
 
 #include "Fixtures.h"
 #include "param/NaviParam.h"
-#include "vote/VotingFp.h"
+#include "vote/Voting.h"
 
 namespace {
 

@@ -8,7 +8,7 @@
 #include "Fixtures.h"
 #include "LogCapture.h"
 #include "param/NaviParam.h"
-#include "vote/VotingFp.h"
+#include "vote/Voting.h"
 
 namespace {
 

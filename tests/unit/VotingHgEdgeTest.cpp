@@ -2,7 +2,7 @@
 #include <gtest/gtest.h>
 
 #include "Fixtures.h"
-#include "vote/VotingHg.h"
+#include "vote/Voting.h"
 
 namespace {
 

@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "Fixtures.h"
-#include "vote/VotingHg.h"
+#include "vote/Voting.h"
 
 namespace {
 

@@ -1,40 +1,36 @@
 #include "driver/OrientationCalc.h"
 
+#include <cstring>
+
 #include "base/NaviLog.h"
 #include "base/NaviMath.h"
 #include "frame/FramePair.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
 #include "gesture/Gesture.h"
-#include "gesture/NaviVoteInfo.h"
 #include "matching/PairMatch.h"
 #include "motion/CenterMove.h"
 #include "motion/DoubleScan.h"
 #include "motion/FingerNoMove.h"
 #include "param/NaviLimits.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
 namespace {
 
-constexpr int32_t kPairMax = FPNAVI_VOTE_CAPACITY - 1;  // entry n + 1 of the last pair must fit
-
-// Loads and pre-processes the whole image at data into s_imageCurr.
-int32_t LoadFrame(const uint8_t* data) {
-    if (ImgInit(&s_imageCurr, 0, s_imageHeight, 0, s_imageWidth, data) != 0)
-        return -1;
-    return ImgPreProcess(&s_imageCurr);
-}
-
-// The current frame becomes the previous one, data the current one, and the pair is evaluated.
+// The current frame becomes the previous one, unless it is the gesture's first, and data the
+// current one. Evaluates the pair.
 int32_t NextFrame(const uint8_t* data) {
-    if (ImgCopy(&s_imagePrev, &s_imageCurr) != 0)
+    const bool first = s_frameNum == 1;
+    if (!first) {
+        if (ImgCopy(&s_imagePrev, &s_imageCurr) != 0)
+            return -1;
+        ImgClear(&s_imageCurr);
+    }
+    if (ImgInit(&s_imageCurr, 0, s_imageHeight, 0, s_imageWidth, data) != 0 ||
+        ImgPreProcess(&s_imageCurr) != 0)
         return -1;
-    ImgClear(&s_imageCurr);
-    if (LoadFrame(data) != 0)
-        return -1;
-    return OrntCalcProcess();
+    return first ? 0 : OrntCalcProcess();
 }
 
 // A frame starts with measures of 0, and only GetCenterAndCoverage changes them. So a frame whose
@@ -45,15 +41,6 @@ bool IsMeasured(const NaviFrame_t& img) {
 
 bool CoversLess(int32_t coverage) {
     return s_imagePrev.cvr < coverage || s_imageCurr.cvr < coverage;
-}
-
-void RecordCenters(int32_t n) {
-    s_voteInfo.xc[n] = s_imagePrev.xc;
-    s_voteInfo.yc[n] = s_imagePrev.yc;
-    s_voteInfo.xc[n + 1] = s_imageCurr.xc;
-    s_voteInfo.yc[n + 1] = s_imageCurr.yc;
-    s_voteInfo.cvr[n] = s_imagePrev.cvr;
-    s_voteInfo.cvr[n + 1] = s_imageCurr.cvr;
 }
 
 // The finger rests: the centroid moved only because the contact changed. Both frames of the pair
@@ -71,12 +58,6 @@ void RecordRest(int32_t n) {
     }
 }
 
-void RecordFingerprint(int32_t n, int32_t vkey) {
-    s_voteInfo.vkey_fp[n] = vkey;
-    s_voteInfo.dx_fp[n] = 0;
-    s_voteInfo.dy_fp[n] = 0;
-}
-
 // The fingerprint methods of the fp modes, cheapest first.
 int32_t CompareFingerprints(int32_t n) {
     if (!AreComparable(&s_imagePrev, &s_imageCurr))
@@ -85,10 +66,13 @@ int32_t CompareFingerprints(int32_t n) {
     const int32_t outcome = TestNoMove(pair.prev, pair.curr, CurrentNoMoveLimits());
     if (outcome == kNoMoveMoved)
         return CoversLess(s_coverageMinFp) ? 0 : MatchPair(pair);
-    const bool resting = outcome == kNoMoveResting;
-    RecordFingerprint(n, resting ? VKEY_NO_MOVE : VKEY_NONE);
-    if (resting)
+    s_voteInfo.vkey_fp[n] = VKEY_NONE;
+    s_voteInfo.dx_fp[n] = 0;
+    s_voteInfo.dy_fp[n] = 0;
+    if (outcome == kNoMoveResting) {
+        s_voteInfo.vkey_fp[n] = VKEY_NO_MOVE;
         RecordRest(n);
+    }
     return 0;
 }
 
@@ -96,7 +80,7 @@ int32_t CompareFingerprints(int32_t n) {
 
 int32_t OrntCalcProcess() {
     const int32_t n = PairCount(s_voteInfo);
-    if (n >= kPairMax)
+    if (n == kPairCountMax)
         return 0;
     if (!IsHg() && !PairWorkAcceptable())
         return -1;
@@ -110,7 +94,12 @@ int32_t OrntCalcProcess() {
     if (CoversLess(s_coverageMinEff))
         return 0;
     CalcCenterMove(&s_imagePrev, &s_imageCurr, &s_voteInfo);
-    RecordCenters(n);
+    s_voteInfo.xc[n] = s_imagePrev.xc;
+    s_voteInfo.yc[n] = s_imagePrev.yc;
+    s_voteInfo.cvr[n] = s_imagePrev.cvr;
+    s_voteInfo.xc[n + 1] = s_imageCurr.xc;
+    s_voteInfo.yc[n + 1] = s_imageCurr.yc;
+    s_voteInfo.cvr[n + 1] = s_imageCurr.cvr;
     if (IsHg()) {
         if (s_voteInfo.vkey_ct[n] == VKEY_NO_MOVE)
             RecordRest(n);
@@ -132,13 +121,23 @@ int32_t OrientationCalc(const uint8_t* data_prev, const uint8_t* data_curr, int3
     if (FingerLifted() || time_out == 1)
         return 0;
     s_frameNum = WrapAdd(s_frameNum, 1);
-    int32_t result = -1;
-    if (GestureGeometryUsable())
-        result = s_frameNum == 1 ? LoadFrame(data_curr) : NextFrame(data_curr);
+    const int32_t result = GestureGeometryUsable() ? NextFrame(data_curr) : -1;
     // A failed frame leaves both empty, so that all further frames of the gesture fail too.
     if (result != 0) {
         ImgClear(&s_imageCurr);
         ImgClear(&s_imagePrev);
     }
     return result;
+}
+
+void FpNaviClear() {
+    using namespace fpnavi;
+    s_lastFrameFlag = 0;
+    s_tuneOkFlag = 0;
+    s_frameNum = 0;
+    std::memset(DoubleScanZonePrev, 0, sizeof DoubleScanZonePrev);
+    std::memset(DoubleScanZoneCurr, 0, sizeof DoubleScanZoneCurr);
+    VoteInfoClear(&s_voteInfo);
+    for (auto* img : {&s_imageCurr, &s_imagePrev, &s_fullImageCurr, &s_fullImagePrev})
+        ImgClear(img);
 }

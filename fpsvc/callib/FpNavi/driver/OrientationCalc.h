@@ -1,5 +1,5 @@
 // The frame-pair driver behind OrientationCalc. Owns nothing; moves frames, counts s_frameNum, lets
-// the motion methods fill the record and advances calc_cnt.
+// the motion methods fill the record and advances calc_cnt. FpNaviClear empties all of it.
 #ifndef FPNAVI_ORIENTATIONCALC_H
 #define FPNAVI_ORIENTATIONCALC_H
 

@@ -2,7 +2,6 @@
 #include <cstring>
 
 #include "param/NaviLimits.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

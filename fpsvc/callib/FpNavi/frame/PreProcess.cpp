@@ -4,7 +4,6 @@
 #include "base/NaviMath.h"
 #include "base/NaviSimd.h"
 #include "frame/NaviFrame.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

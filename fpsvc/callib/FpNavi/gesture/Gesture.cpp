@@ -1,9 +1,14 @@
 #include "gesture/Gesture.h"
 
-namespace fpnavi {
+#include <cstddef>
+#include <cstring>
 
-int32_t s_frameNum = 0;
-int32_t s_lastFrameFlag = 0;
-int32_t s_tuneOkFlag = 0;
+void fpnavi::VoteInfoClear(NaviVoteInfo_t* voteInfo) {
+    std::memset(voteInfo, 0, offsetof(NaviVoteInfo_t, xc_ds));
+    for (auto* entries : {&voteInfo->cvr_ds, &voteInfo->dx_ds, &voteInfo->dy_ds})
+        std::memset(*entries, 0, sizeof *entries);
+}
 
-}  // namespace fpnavi
+NaviVoteInfo_t* PrintNaviLog() {
+    return &fpnavi::s_voteInfo;
+}

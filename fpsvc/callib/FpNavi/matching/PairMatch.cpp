@@ -15,10 +15,9 @@
 #include "base/NaviMath.h"
 #include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "matching/CandidateSearch.h"
 #include "matching/DisplacementScore.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

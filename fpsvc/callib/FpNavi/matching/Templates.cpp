@@ -3,7 +3,6 @@
 #include <algorithm>
 
 #include "base/NaviMath.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

@@ -12,8 +12,7 @@
 #include "base/NaviMath.h"
 #include "base/NaviSimd.h"
 #include "frame/NaviFrame.h"
-#include "gesture/NaviVoteInfo.h"
-#include "param/NaviMode.h"
+#include "gesture/Gesture.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {

@@ -2,7 +2,7 @@
 
 #include <cstring>
 
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 
 namespace fpnavi {
 

@@ -10,7 +10,6 @@
 #include <algorithm>
 #include <cstdint>
 
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -37,18 +36,6 @@ int64_t SearchWork(int64_t tpltWidth, int64_t tpltHeight) {
     const int64_t rows = s_centerHeight - tpltHeight + 1;
     const int64_t columns = int64_t{s_boundHeight} + s_centerWidth - tpltWidth - s_boundWidth + 1;
     return CountProduct(CountProduct(rows, columns), CountProduct(tpltWidth, tpltHeight));
-}
-
-int64_t MatchWork() {
-    const bool tiled = IsTiled();
-    return CountProduct(s_candidateNum, CountProduct(tiled ? s_fullImageWidth : s_imageWidth,
-                                                     tiled ? s_fullImageHeight : s_imageHeight));
-}
-
-int64_t NoMoveWork() {
-    const int64_t shifts =
-        CountProduct(2 * int64_t{s_smallMoveTolRow} + 1, 2 * int64_t{s_smallMoveTolCol} + 1);
-    return CountProduct(shifts, CountProduct(s_imageWidth, s_imageHeight));
 }
 
 }  // namespace
@@ -78,11 +65,9 @@ bool HgDetectGeometryUsable() {
 bool GestureGeometryUsable() {
     if (!ImageGeometryUsable())
         return false;
-    if (IsHg())  // the hg mode searches nothing
-        return true;
-    if (s_candidateNum < 1 || s_candidateNum > kCandidateMax)
-        return false;
-    return !IsTiled() || FullImageGeometryUsable();
+    // The hg mode searches nothing.
+    return IsHg() || (s_candidateNum >= 1 && s_candidateNum <= kCandidateMax &&
+                      (!IsTiled() || FullImageGeometryUsable()));
 }
 
 bool PairWorkAcceptable() {
@@ -90,7 +75,12 @@ bool PairWorkAcceptable() {
     const int64_t search =
         s_tpltNum / 2 *
         (SearchWork(s_tpltWidthUD, s_tpltHeightUD) + SearchWork(s_tpltWidthLR, s_tpltHeightLR));
-    return search + MatchWork() + NoMoveWork() <= kPairWorkMax;
+    const int64_t image = CountProduct(s_imageWidth, s_imageHeight);
+    const int64_t matched = IsTiled() ? CountProduct(s_fullImageWidth, s_fullImageHeight) : image;
+    const int64_t shifts =
+        CountProduct(2 * int64_t{s_smallMoveTolRow} + 1, 2 * int64_t{s_smallMoveTolCol} + 1);
+    return search + CountProduct(s_candidateNum, matched) + CountProduct(shifts, image) <=
+           kPairWorkMax;
 }
 
 }  // namespace fpnavi

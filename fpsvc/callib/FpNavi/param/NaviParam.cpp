@@ -1,94 +1,51 @@
 #include "param/NaviParam.h"
 
+#include <cstring>
+
+#include "base/NaviMath.h"
+
 namespace fpnavi {
+namespace {
 
-int32_t s_sensorBackFlag = 0;
-int32_t s_directionControlFlag = 3;
-int32_t s_blockWidthHg = 8;
-int32_t s_blockHeightHg = 4;
-int32_t s_blockColNumHg = 5;
-int32_t s_blockRowNumHg = 12;
-int32_t s_meanThreshold = 180;
-int32_t s_deformThreshold = 3;
-int32_t s_singleMoveThreshold = 2;
-int32_t s_totalMoveThreshold = 8;
-int32_t s_imageWidthHg = 40;
-int32_t s_imageHeightHg = 48;
-int32_t s_moveCntMinThr = 2;
-int32_t s_moveCntEffThr = 1;
-int32_t s_modeFlag = 0;
-int32_t _NAVI_TimeOut_threshold = 2;
-int32_t _NAVI_blk_selection_mode = 0;
-int32_t iDCMode = 1;
-int32_t _NAVI_DC_REF = 128;
-int32_t _NAVI_TOP_REF = 128;
-int32_t _NAVI_INPUT_K = 374;
-int32_t _NAVI_GAIN_REF = 10002;
-_NAVI_struRange _NAVI_range_recommend = {180, 220};
-_NAVI_struRange _NAVI_range_effective = {160, 240};
-_NAVI_struRange _NAVI_range_mean = {140, 220};
-_NAVI_struRange _NAVI_range_mean_recommend = {160, 200};
-_NAVI_struRange _NAVI_top_mean_interval = {10, 15};
-int32_t s_sensorWidth = 80;
-int32_t s_sensorHeight = 200;
-int32_t s_blockWidthFp = 8;
-int32_t s_blockHeightFp = 2;
-int32_t s_blockColNumFp = 7;
-int32_t s_blockRowNumFp = 18;
-int32_t s_centerWidth = 40;
-int32_t s_centerHeight = 20;
-int32_t s_boundWidth = 8;
-int32_t s_boundHeight = 8;
-int32_t s_gapWidth = 32;
-int32_t s_gapHeight = 16;
-int32_t s_coverageMinFp = 50;
-int32_t s_coverageMinEff = 15;
-int32_t s_smallMoveTolCol = 2;
-int32_t s_smallMoveTolRow = 2;
-int32_t s_overlapAreaMinFp = 200;
-int32_t s_templateWidth = 10;
-int32_t s_templateHeight = 6;
-int32_t s_candidateNum = 100;
-int32_t s_diffThresholdStr = 30;
-int32_t s_diffThresholdTol = 30;
-int32_t s_fftResThreshold = 7;
-int32_t s_meanThresholdFp = 40;
-int32_t s_coverageMaxCt = 90;
-int32_t s_downSampleFlag = 0;
-int32_t s_multiBloclkFlag = 1;
-int32_t s_dimensionlessFlag = 0;
-int32_t s_cutOffPercent = 3;
-int32_t s_overlapAreaMinNoMove = 100;
-int32_t s_totalMoveThresholdLongpressCt = -1;
-int32_t s_totalMoveThresholdLongpressFp = -1;
-int32_t s_open_vkey_none_navi = 1;
-int32_t s_ct_none_threshold = 3;
-int32_t s_ct_not_move_threshold = 10;
-int32_t s_fpImp = 80;
-int32_t s_ctImp = 20;
-int32_t s_minDelta = 4;
-int32_t s_fpMoveThreshold = 9;
-int32_t s_rangeThreshold = 80;
-int32_t s_blkMeanDiffThreshold = 50;
-int32_t s_highSensitiveMode = 1;
-int32_t s_fftFreqLow = 5;
-int32_t s_fftFreqHigh = 12;
-int32_t s_DoubleScanCvrThreshold = 10;
-int32_t s_logShowFlag = 0;
+// Length of a full image's side: the centre, and where there are tiles also on both sides a border
+// tile and a gap.
+int32_t FullSide(int32_t center, int32_t gap, int32_t bound) {
+    return IsTiled() ? WrapAdd(center, WrapMul(2, WrapAdd(gap, bound))) : center;
+}
 
-int32_t s_blockWidth = 0;
-int32_t s_blockHeight = 0;
-int32_t s_blockColNum = 0;
-int32_t s_blockRowNum = 0;
-int32_t s_doubleScanFlag = 0;
-int32_t s_imageWidth = 0;
-int32_t s_imageHeight = 0;
-int32_t s_fullImageWidth = 0;
-int32_t s_fullImageHeight = 0;
-int32_t s_tpltNum = 0;
-int32_t s_tpltWidthUD = 0;
-int32_t s_tpltHeightUD = 0;
-int32_t s_tpltWidthLR = 0;
-int32_t s_tpltHeightLR = 0;
+void DeriveGeometry() {
+    const bool hg = IsHg();
+    s_blockWidth = hg ? s_blockWidthHg : s_blockWidthFp;
+    s_blockHeight = hg ? s_blockHeightHg : s_blockHeightFp;
+    s_blockColNum = hg ? s_blockColNumHg : s_blockColNumFp;
+    s_blockRowNum = hg ? s_blockRowNumHg : s_blockRowNumFp;
+    // Sticky: a process whose sensor has scanned twice keeps to it.
+    if (IsDoubleScan())
+        s_doubleScanFlag = 1;
+    s_imageHeight = WrapMul(s_blockRowNum, s_blockHeight);
+    s_imageWidth = WrapMul(s_blockColNum, s_blockWidth);
+    s_fullImageHeight = FullSide(s_centerHeight, s_gapHeight, s_boundHeight);
+    s_fullImageWidth = FullSide(s_centerWidth, s_gapWidth, s_boundWidth);
+    s_tpltNum = IsTiled() ? 8 : 4;
+    s_tpltHeightUD = s_templateHeight;
+    s_tpltWidthLR = s_templateHeight;
+    s_tpltWidthUD = s_templateWidth;
+    s_tpltHeightLR = s_templateWidth;
+}
 
+}  // namespace
 }  // namespace fpnavi
+
+int32_t SetNaviParam(const int32_t* params) {
+    using namespace fpnavi;
+    if (params == nullptr)
+        return -1;
+    std::memcpy(static_cast<void*>(&s_naviParams), params, sizeof s_naviParams);
+    DeriveGeometry();
+    // Every second row only is scanned: what counts rows of the sensor is halved.
+    if (IsDownSampled()) {
+        s_sensorHeight /= 2;
+        s_smallMoveTolRow /= 2;
+    }
+    return 0;
+}

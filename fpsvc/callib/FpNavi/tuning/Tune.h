@@ -7,39 +7,40 @@
 #include <cstdint>
 
 #include "FpNavi.h"
+#include "tuning/TuneMeasure.h"
+#include "tuning/TuneStep.h"
 
 namespace fpnavi {
 
-// Of the last frame that could be measured; _NAVI_mean is 0 after one that could not. Flags: -1
-// below a band, 0 inside, 1 above, 3 not computed yet.
-extern uint32_t _NAVI_img_histogram[256];  // of the measured block, by grey level
-extern uint32_t _NAVI_mean;                // grey of the measured block; 3 before the first call
-extern uint32_t _NAVI_top_mean;            // grey of its brightest pixels; 3 before the first call
-extern int32_t _NAVI_flag_effective;       // _NAVI_mean against _NAVI_range_mean
-extern int32_t _NAVI_flag_recommend;       // _NAVI_mean against _NAVI_range_mean_recommend
-extern int32_t _NAVI_flag_recommend_top;  // _NAVI_top_mean against _NAVI_range_recommend; kept only
-extern int32_t _NAVI_flag_non_linear;     // 1: mean and top both lie outside 10..250
-extern uint32_t _NAVI_G20C;               // packed gain code: four fields of 4 bits
-extern uint32_t _NAVI_K_value;            // grey levels per DC step, in hundredths
+// Of the last frame that could be measured, but for a mean of 0 after one that could not.
+inline GreyReading s_reading = {{3, {}}, 3, 3, 3, 3, 0, 0, 0};
+inline DcState s_dc = {3, 3, 3, 0, 0, 0, 0, 0};
 
-// The DC and its steps.
-extern uint32_t _NAVI_dc_mode;            // iDCMode at the last call
-extern uint32_t _NAVI_dc_residual;        // DC mode 1: the register's bits above the DC byte
-extern uint32_t _NAVI_dc_current;         // the DC that is being tuned
-extern uint32_t _NAVI_dc_pre;             // DC that was in the sensor at the last call
-extern int32_t _NAVI_flag_recommend_pre;  // _NAVI_flag_recommend of the call before; 3 without one
-extern uint32_t _NAVI_delta_dc_val_top;   // step that would bring the top grey to 180; kept only
-extern uint32_t _NAVI_delta_dc_val_mean;  // step that would bring the mean to 180
-extern uint32_t _NAVI_delta_dc_val;       // step to apply
-extern int32_t _NAVI_delta_dc_orient;     // 1 raise, -1 lower, 0 neither
-
-// 0 no further step needed, 1 stepped though the mean is effective, 2 stepped, look again.
-extern uint32_t _NAVI_NoMoreProcess;
+// Their members by names of their own.
+inline constexpr uint32_t (&_NAVI_img_histogram)[kGreyLevels] = s_reading.histogram;
+inline constexpr uint32_t& _NAVI_mean = s_reading.mean;
+inline constexpr uint32_t& _NAVI_top_mean = s_reading.top;
+inline constexpr int32_t& _NAVI_flag_effective = s_reading.effective;
+inline constexpr int32_t& _NAVI_flag_recommend = s_reading.recommend;
+inline constexpr int32_t& _NAVI_flag_recommend_top = s_reading.recommendTop;
+inline constexpr int32_t& _NAVI_flag_non_linear = s_reading.nonLinear;
+inline constexpr uint32_t& _NAVI_G20C = s_reading.gainCode;
+inline constexpr uint32_t& _NAVI_K_value = s_reading.gainFactor;
+inline constexpr uint32_t& _NAVI_dc_current = s_dc.current;
+inline constexpr uint32_t& _NAVI_dc_pre = s_dc.pre;
+inline constexpr int32_t& _NAVI_flag_recommend_pre = s_dc.recommendPre;
+inline constexpr uint32_t& _NAVI_delta_dc_val_top = s_dc.stepTop;
+inline constexpr uint32_t& _NAVI_delta_dc_val_mean = s_dc.stepMean;
+inline constexpr uint32_t& _NAVI_delta_dc_val = s_dc.step;
+inline constexpr int32_t& _NAVI_delta_dc_orient = s_dc.orient;
+inline constexpr uint32_t& _NAVI_NoMoreProcess = s_dc.noMoreProcess;
 
 // The run.
-extern int32_t _NAVI_TimeOut;           // calls since the last completed tuning
-extern int32_t _NAVI_flag_param_reset;  // 1: the last call completed, the next starts afresh
-extern _NAVI_SIZE sImgSizeInfo;         // image size at the last call
+inline uint32_t _NAVI_dc_mode = 0;          // iDCMode at the last call
+inline uint32_t _NAVI_dc_residual = 0;      // DC mode 1: the register's bits above the DC byte
+inline int32_t _NAVI_TimeOut = 0;           // calls since the last completed tuning
+inline int32_t _NAVI_flag_param_reset = 0;  // 1: the last call completed, the next starts afresh
+inline _NAVI_SIZE sImgSizeInfo = {0, 0};    // image size at the last call
 
 // Single steps on the state above.
 

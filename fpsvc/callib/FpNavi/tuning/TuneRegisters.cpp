@@ -9,33 +9,18 @@ namespace {
 constexpr uint32_t kDcAsDifference = 0;  // of the bytes of each half
 constexpr uint32_t kDcInLowByte = 1;
 constexpr uint32_t kByteMask = 0xFF;
-constexpr uint32_t kGainFieldMax = 7;  // the amplifiers have eight steps
 
 // Amplification at each step: tenths for the first pair of stages, units for the others.
 constexpr int32_t _NAVI_gain_ratio_21[] = {10, 20, 40, 56, 70, 80, 112, 140};
 constexpr int32_t _NAVI_gain_ratio_43[] = {1, 2, 3, 4, 5, 6, 7, 8};
 
-// The fields of a packed gain code that enter the gain factor.
-struct GainFields {
-    uint32_t first;   // bits 12 to 15, a step of _NAVI_gain_ratio_21
-    uint32_t second;  // bits 4 to 7, a step of _NAVI_gain_ratio_43
-    uint32_t third;   // bits 0 to 3, likewise
-};
+// Set in a field above 7, of the three fields that enter the gain factor.
+constexpr uint32_t kBeyondTables = 0x8088;
 
-GainFields SplitGainCode(uint32_t code) {
-    return {code >> 12 & 0xFU, code >> 4 & 0xFU, code & 0xFU};
-}
-
-bool FieldsUsable(const GainFields& fields) {
-    return fields.first <= kGainFieldMax && fields.second <= kGainFieldMax &&
-           fields.third <= kGainFieldMax;
-}
-
-// factor times the ratios of the fields, wrapping.
-int32_t Amplify(int32_t factor, const GainFields& fields) {
-    return WrapMul(WrapMul(WrapMul(factor, _NAVI_gain_ratio_21[fields.first]),
-                           _NAVI_gain_ratio_43[fields.third]),
-                   _NAVI_gain_ratio_43[fields.second]);
+// Amplification at the packed gain code g in tenths, 10..8960.
+int32_t Ratio(uint32_t g) {
+    return _NAVI_gain_ratio_21[g >> 12 & 0xFU] * _NAVI_gain_ratio_43[g >> 4 & 0xFU] *
+           _NAVI_gain_ratio_43[g & 0xFU];
 }
 
 }  // namespace
@@ -69,15 +54,11 @@ uint32_t PackGainCode(uint32_t gain20, uint32_t gain2C) {
 }
 
 bool GainCodesUsable(uint32_t g) {
-    return FieldsUsable(SplitGainCode(g)) &&
-           FieldsUsable(SplitGainCode(static_cast<uint32_t>(_NAVI_GAIN_REF)));
+    return ((g | static_cast<uint32_t>(_NAVI_GAIN_REF)) & kBeyondTables) == 0;
 }
 
 int32_t _NAVI_K_CALC(uint32_t g) {
-    const int32_t input_k_g_r = Amplify(_NAVI_INPUT_K, SplitGainCode(g));
-    const int32_t reference =
-        Amplify(1, SplitGainCode(static_cast<uint32_t>(_NAVI_GAIN_REF)));  // 10..8960
-    return input_k_g_r / reference;
+    return WrapMul(_NAVI_INPUT_K, Ratio(g)) / Ratio(static_cast<uint32_t>(_NAVI_GAIN_REF));
 }
 
 }  // namespace fpnavi

@@ -32,16 +32,6 @@ uint32_t StepToTarget(int32_t grey, uint32_t gainFactor, uint32_t before) {
     return gainFactor == 0 ? 1U : std::max(enlarged / gainFactor, 1U);
 }
 
-uint32_t Raised(const DcState& dc) {
-    return std::min(WrapAddU(dc.current, dc.step), kDcMax);
-}
-
-uint32_t Lowered(const DcState& dc, int32_t reference) {
-    const int32_t reachable = WrapAdd(reference, static_cast<int32_t>(dc.step));
-    return static_cast<int32_t>(dc.current) > reachable ? WrapSubU(dc.current, dc.step)
-                                                        : static_cast<uint32_t>(reference);
-}
-
 // A saturated frame whose recommendation differs from that of the last call: the last step
 // overshot.
 bool Overshot(const DcState& dc, const GreyReading& reading) {
@@ -85,12 +75,18 @@ DcState ApplyStep(const DcState& before, int32_t effective, int32_t reference) {
     if (before.orient != 1 && before.orient != -1)
         return after;
     const bool raise = before.orient == 1;
-    const uint32_t limit = raise ? kDcMax : static_cast<uint32_t>(reference);
-    if (before.current == limit) {  // the DC cannot go further in the wanted direction
+    const auto lowest = static_cast<uint32_t>(reference);
+    if (before.current == (raise ? kDcMax : lowest)) {  // no further in the wanted direction
         after.recommendPre = kUnknown;
         return after;
     }
-    after.current = raise ? Raised(before) : Lowered(before, reference);
+    if (raise)
+        after.current = std::min(WrapAddU(before.current, before.step), kDcMax);
+    else if (static_cast<int32_t>(before.current) >
+             WrapAdd(reference, static_cast<int32_t>(before.step)))
+        after.current = WrapSubU(before.current, before.step);
+    else
+        after.current = lowest;
     after.noMoreProcess = effective == 0 ? 1 : 2;
     return after;
 }

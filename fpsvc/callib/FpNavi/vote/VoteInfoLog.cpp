@@ -1,9 +1,6 @@
-#include "vote/VoteInfoLog.h"
-
-#include <cstdint>
-
 #include "base/NaviLog.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
+#include "vote/Voting.h"
 
 // Deliberate: lists of single values are given eleven values for ten conversions. Readers of the
 // log depend on ten, so the eleventh stays unprinted.
@@ -20,22 +17,20 @@
     " {(%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d) (%d,%d)"
 
 namespace fpnavi {
-namespace {
 
-const char kFunction[] = "Voting_fp_mode";
+constexpr char kFunction[] = "Voting_fp_mode";
 
-void LogCentroids(const NaviVoteInfo_t& info) {
+void LogVoteInfo() {
+    const NaviVoteInfo_t& info = s_voteInfo;
     const int32_t n = PairCount(info);
+    NAVI_LOG(kFunction, 508, "##################### Vote information ########################\n");
+    NAVI_LOG(kFunction, 510, "calculate count = %d\n", n);
     NAVI_LOG(kFunction, 512, "Initial and final centroid position are (%d, %d) and (%d, %d).\n",
              info.xc[0], info.yc[0], info.xc[n], info.yc[n]);
     NAVI_LOG(kFunction, 516, "Centroid method result array are:\n" TEN_FORMATS,
              ELEVEN(info.vkey_ct));
     NAVI_LOG(kFunction, 521, "Centroid results (dx, dy) array are:\n" ELEVEN_PAIR_FORMATS "}\n",
              ELEVEN_PAIRS(info.dx_ct, info.dy_ct));
-}
-
-void LogDoubleScan(const NaviVoteInfo_t& info) {
-    const int32_t n = PairCount(info);
     NAVI_LOG(kFunction, 523,
              "Initial and final centroid position of hardware navigation are (%d, %d) and "
              "(%d, %d).\n",
@@ -44,24 +39,11 @@ void LogDoubleScan(const NaviVoteInfo_t& info) {
              "Centroid results of hardware navigation (dx, dy) array are:\n" ELEVEN_PAIR_FORMATS
              "}\n",
              ELEVEN_PAIRS(info.dx_ds, info.dy_ds));
-}
-
-void LogFingerprint(const NaviVoteInfo_t& info) {
     NAVI_LOG(kFunction, 532, "Fingerprint match result array are:\n" TEN_FORMATS,
              ELEVEN(info.vkey_fp));
     NAVI_LOG(kFunction, 537, "Fingerprint results (dx, dy) array are:\n" ELEVEN_PAIR_FORMATS " }\n",
              ELEVEN_PAIRS(info.dx_fp, info.dy_fp));
     NAVI_LOG(kFunction, 541, "Fingerprint diff array are:\n" TEN_FORMATS, ELEVEN(info.diff));
-}
-
-}  // namespace
-
-void LogVoteInfo() {
-    NAVI_LOG(kFunction, 508, "##################### Vote information ########################\n");
-    NAVI_LOG(kFunction, 510, "calculate count = %d\n", PairCount(s_voteInfo));
-    LogCentroids(s_voteInfo);
-    LogDoubleScan(s_voteInfo);
-    LogFingerprint(s_voteInfo);
 }
 
 }  // namespace fpnavi

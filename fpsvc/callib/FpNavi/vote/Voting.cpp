@@ -1,10 +1,9 @@
 // Voting: when a vote is due, which mode votes, and what the host's settings make of the key.
+#include "vote/Voting.h"
+
 #include "base/NaviLog.h"
 #include "gesture/Gesture.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
-#include "vote/VotingFp.h"
-#include "vote/VotingHg.h"
 
 namespace fpnavi {
 namespace {
@@ -22,16 +21,10 @@ int32_t MirrorForBack(int32_t vkey_value) {
 int32_t FilterDirection(int32_t vkey_value) {
     const bool horizontal = vkey_value == VKEY_RIGHT || vkey_value == VKEY_LEFT;
     const bool vertical = vkey_value == VKEY_UP || vkey_value == VKEY_DOWN;
-    switch (s_directionControlFlag) {
-        case kDirectionNone:
-            return VKEY_NO_MOVE;
-        case kDirectionVertical:
-            return horizontal ? VKEY_NO_MOVE : vkey_value;
-        case kDirectionHorizontal:
-            return vertical ? VKEY_NO_MOVE : vkey_value;
-        default:
-            return vkey_value;
-    }
+    const bool unwanted = s_directionControlFlag == kDirectionNone ||
+                          (s_directionControlFlag == kDirectionVertical && horizontal) ||
+                          (s_directionControlFlag == kDirectionHorizontal && vertical);
+    return unwanted ? VKEY_NO_MOVE : vkey_value;
 }
 
 }  // namespace

@@ -1,15 +1,11 @@
-#include "vote/VotingFp.h"
-
 #include <algorithm>
 #include <iterator>
 #include <optional>
 
 #include "base/NaviMath.h"
 #include "gesture/Gesture.h"
-#include "gesture/NaviVoteInfo.h"
-#include "param/NaviMode.h"
 #include "param/NaviParam.h"
-#include "vote/VoteInfoLog.h"
+#include "vote/Voting.h"
 
 namespace fpnavi {
 namespace {
@@ -23,20 +19,13 @@ struct Move {
     int32_t dy;
 };
 
-// Percentages summed over the pairs: how much of the way went in each direction.
-struct DirectionSums {
-    int32_t up;
-    int32_t right;
-    int32_t down;
-    int32_t left;
-};
-
-// What the pairs of a gesture add up to.
+// What the pairs of a gesture add up to. Shares are percentages summed over the pairs: how much of
+// the way went up, down, right and left.
 struct Tally {
     Move sumCt;
     Move sumFp;
-    DirectionSums method_ct;
-    DirectionSums method_fp;
+    int32_t method_ct[4];
+    int32_t method_fp[4];
     int32_t count_of_diff_result;  // pairs that template matching or the no-move test saw rest
 };
 
@@ -44,10 +33,6 @@ Move CtMove(int32_t i) {
     if (ScansTwice())
         return {s_voteInfo.dx_ds[i], s_voteInfo.dy_ds[i]};
     return {s_voteInfo.dx_ct[i], s_voteInfo.dy_ct[i]};
-}
-
-Move FpMove(int32_t i) {
-    return {s_voteInfo.dx_fp[i], s_voteInfo.dy_fp[i]};
 }
 
 void Accumulate(const Move& move, Move* sum) {
@@ -64,95 +49,58 @@ int32_t LengthJudge(const Move& move) {
     return IntSqrt(WrapMul(sqrt_precision_times, SquaredLength(move)));
 }
 
-bool LongEnough(int32_t length_judge) {
-    return length_judge >= WrapMul(precision_times, s_minDelta);
-}
-
-// Adds the shares of one pair's move, in percent, to the sums. Returns false for a move without
-// extent, which has no shares.
-bool AddShares(const Move& move, DirectionSums* sums) {
+// Adds the shares of one pair's move to the sums. Returns false for a move without extent, which
+// has no shares.
+bool AddShares(const Move& move, int32_t (&sums)[4]) {
     const int32_t dx_tmp = WrapMul(sqrt_precision_times, WrapAbs(move.dx));
     const int32_t dy_tmp = WrapMul(sqrt_precision_times, WrapAbs(move.dy));
     const int32_t sum_tmp = WrapAdd(dx_tmp, dy_tmp);
     if (sum_tmp == 0)
         return false;
-    int32_t& vertical = move.dy > 0 ? sums->up : sums->down;
-    int32_t& horizontal = move.dx > 0 ? sums->right : sums->left;
+    int32_t& vertical = sums[move.dy > 0 ? 0 : 1];
+    int32_t& horizontal = sums[move.dx > 0 ? 2 : 3];
     vertical = WrapAdd(vertical, WrapDiv(WrapMul(precision_times, dy_tmp), sum_tmp));
     horizontal = WrapAdd(horizontal, WrapDiv(WrapMul(precision_times, dx_tmp), sum_tmp));
     return true;
-}
-
-// Adds the shares of pair i by both methods. Returns false when a motionless pair was to be scored.
-bool ScorePair(int32_t i, bool fpTrusted, Tally* tally) {
-    const Move ct = CtMove(i);
-    const Move fp = FpMove(i);
-    if (LongEnough(LengthJudge(ct)) && !AddShares(ct, &tally->method_ct))
-        return false;
-    const int32_t length_judge_fp = LengthJudge(fp);
-    if (!fpTrusted || !LongEnough(length_judge_fp))
-        return true;
-    return length_judge_fp != 0 && AddShares(fp, &tally->method_fp);
 }
 
 // Adds up all pairs; empty when a motionless pair was to be scored.
 std::optional<Tally> TallyPairs() {
     Tally tally = {};
     const int32_t calc_cnt = PairCount(s_voteInfo);
+    const int32_t length_min = WrapMul(precision_times, s_minDelta);
     for (int32_t i = 0; i < calc_cnt; ++i) {
+        const Move ct = CtMove(i);
+        const Move fp = {s_voteInfo.dx_fp[i], s_voteInfo.dy_fp[i]};
         const bool fpTrusted = s_voteInfo.diff[i] <= s_diffThresholdStr;
-        Accumulate(CtMove(i), &tally.sumCt);
+        Accumulate(ct, &tally.sumCt);
         if (fpTrusted)
-            Accumulate(FpMove(i), &tally.sumFp);
+            Accumulate(fp, &tally.sumFp);
         if (s_voteInfo.vkey_fp[i] == VKEY_NO_MOVE) {
             ++tally.count_of_diff_result;
             continue;
         }
-        if (!ScorePair(i, fpTrusted, &tally))
+        if (LengthJudge(ct) >= length_min && !AddShares(ct, tally.method_ct))
+            return std::nullopt;
+        const int32_t length_fp = LengthJudge(fp);
+        if (fpTrusted && length_fp >= length_min &&
+            (length_fp == 0 || !AddShares(fp, tally.method_fp)))
             return std::nullopt;
     }
     return tally;
 }
 
-// A mixed score of both methods for one direction.
-int32_t MixScore(int32_t fp, int32_t ct) {
-    return WrapAdd(WrapMul(s_fpImp, fp), WrapMul(s_ctImp, ct)) / precision_times;
-}
-
-// The key of the largest score; of equal ones the later in the order up, down, right, left wins.
-int32_t ChooseKey(const DirectionSums& fp, const DirectionSums& ct) {
-    const int32_t score[] = {MixScore(fp.up, ct.up), MixScore(fp.down, ct.down),
-                             MixScore(fp.right, ct.right), MixScore(fp.left, ct.left)};
-    const int32_t score_max = *std::max_element(std::begin(score), std::end(score));
-    const int32_t score_min = *std::min_element(std::begin(score), std::end(score));
-    if (score_min == score_max && MayAnswerNone())
+// The key of the largest mixed score of both methods; of equal ones the last.
+int32_t ChooseKey(const Tally& tally) {
+    int32_t score[4];
+    for (int32_t d = 0; d < 4; ++d)
+        score[d] =
+            WrapAdd(WrapMul(s_fpImp, tally.method_fp[d]), WrapMul(s_ctImp, tally.method_ct[d])) /
+            precision_times;
+    const auto [least, most] = std::minmax_element(std::begin(score), std::end(score));
+    if (*least == *most && MayAnswerNone())
         return VKEY_NONE;
-    int32_t vkey_value = VKEY_NONE;
-    for (int32_t d = 0; d < 4; ++d) {
-        if (score[d] == score_max)
-            vkey_value = VKEY_UP + d;
-    }
-    return vkey_value;
-}
-
-// What the distances alone decide: a key, or empty when the scores have to.
-std::optional<int32_t> JudgeDistances(const Tally& tally, int32_t ct_final_distance,
-                                      int32_t fp_final_distance) {
-    const int32_t calc_cnt = PairCount(s_voteInfo);
-    const bool anyRest = tally.count_of_diff_result != 0;
-    const bool hardlyMoved =
-        ct_final_distance < s_ct_none_threshold && ct_final_distance > 0 && fp_final_distance == 0;
-    if (hardlyMoved && !anyRest && MayAnswerNone())
-        return VKEY_NONE;
-    if (anyRest && fp_final_distance <= s_fpMoveThreshold &&
-        ct_final_distance <= s_ct_not_move_threshold)
-        return VKEY_NO_MOVE;
-    const int32_t final_ct_and_fp = WrapAdd(ct_final_distance, fp_final_distance);
-    const bool oneMovingPair = calc_cnt - tally.count_of_diff_result <= 1;
-    if (calc_cnt == 0 || final_ct_and_fp <= s_totalMoveThreshold ||
-        (oneMovingPair && s_directionControlFlag == kDirectionVertical))
-        return VKEY_NO_MOVE;
-    return std::nullopt;
+    return VKEY_UP + static_cast<int32_t>(most - score);
 }
 
 }  // namespace
@@ -163,15 +111,24 @@ int32_t Voting_fp_mode() {
     const std::optional<Tally> tally = TallyPairs();
     if (!tally)
         return -1;
+    const int32_t calc_cnt = PairCount(s_voteInfo);
+    const int32_t rest_cnt = tally->count_of_diff_result;
     const int32_t ct_final_distance = IntSqrt(SquaredLength(tally->sumCt));
     const int32_t fp_final_distance = IntSqrt(SquaredLength(tally->sumFp));
-    if (const auto decided = JudgeDistances(*tally, ct_final_distance, fp_final_distance))
-        return *decided;
-    // The finger is still down after a short way: a long press.
-    if (!FingerLifted() && ct_final_distance < s_totalMoveThresholdLongpressCt &&
-        fp_final_distance < s_totalMoveThresholdLongpressFp)
-        return VKEY_NO_MOVE;
-    return ChooseKey(tally->method_fp, tally->method_ct);
+    const bool hardlyMoved =
+        ct_final_distance < s_ct_none_threshold && ct_final_distance > 0 && fp_final_distance == 0;
+    if (hardlyMoved && rest_cnt == 0 && MayAnswerNone())
+        return VKEY_NONE;
+    const bool rested = rest_cnt != 0 && fp_final_distance <= s_fpMoveThreshold &&
+                        ct_final_distance <= s_ct_not_move_threshold;
+    const bool tooShort =
+        calc_cnt == 0 || WrapAdd(ct_final_distance, fp_final_distance) <= s_totalMoveThreshold;
+    const bool oneMovingPair =
+        calc_cnt - rest_cnt <= 1 && s_directionControlFlag == kDirectionVertical;
+    // The finger is still down after a short way.
+    const bool longPress = !FingerLifted() && ct_final_distance < s_totalMoveThresholdLongpressCt &&
+                           fp_final_distance < s_totalMoveThresholdLongpressFp;
+    return rested || tooShort || oneMovingPair || longPress ? VKEY_NO_MOVE : ChooseKey(*tally);
 }
 
 }  // namespace fpnavi

@@ -1,15 +1,14 @@
-#include "vote/VotingHg.h"
-
 #include <algorithm>
 
 #include "base/NaviMath.h"
-#include "gesture/NaviVoteInfo.h"
+#include "gesture/Gesture.h"
 #include "param/NaviParam.h"
+#include "vote/Voting.h"
 
 namespace fpnavi {
 namespace {
 
-// Verdicts of the pairs, counted.
+// Verdicts of the first calc_cnt pairs, counted.
 struct VerdictCounts {
     int32_t byKey[VKEY_NO_MOVE + 1];
 
@@ -18,7 +17,6 @@ struct VerdictCounts {
     }
 };
 
-// Of the first calc_cnt pairs.
 VerdictCounts CountVerdicts(int32_t calc_cnt) {
     VerdictCounts counts = {};
     for (int32_t i = 0; i < calc_cnt; ++i) {
@@ -29,52 +27,42 @@ VerdictCounts CountVerdicts(int32_t calc_cnt) {
     return counts;
 }
 
-// Enough pairs moved at all.
-bool CountsSuffice(const VerdictCounts& counts) {
-    const int32_t move_cnt = counts.Moving();
-    return move_cnt >= s_moveCntEffThr ||
-           (counts.byKey[VKEY_NO_MOVE] < move_cnt && move_cnt > s_moveCntMinThr);
-}
-
-// A stroke along one axis: the keys of its two directions and of the axis across, and the first and
-// last place of the centroid on it.
+// A stroke along one axis: the keys of its two directions, and the first and last place of the
+// centroid on it.
 struct Axis {
     int32_t positive;
     int32_t negative;
-    int32_t across1;
-    int32_t across2;
     int32_t first;
     int32_t last;
 };
 
-// More pairs have the verdict vkey than either key across, and none has the opposite.
-bool CountsFavour(const VerdictCounts& counts, const Axis& axis, int32_t vkey, int32_t opposite) {
-    return counts.byKey[vkey] > counts.byKey[axis.across1] &&
-           counts.byKey[vkey] > counts.byKey[axis.across2] && counts.byKey[opposite] == 0;
-}
-
-int32_t VoteAlong(const Axis& axis, const VerdictCounts& counts) {
+int32_t VoteAlong(const Axis& axis, const Axis& across, const VerdictCounts& counts) {
     const int32_t total = WrapSub(axis.last, axis.first);
     if (WrapAbs(total) < s_totalMoveThreshold)
         return VKEY_NO_MOVE;
     // A centroid that crossed the middle has moved, whatever the verdicts of single pairs are.
     if (WrapMul(axis.first, axis.last) < 0)
         return total > 0 ? axis.positive : axis.negative;
-    if (CountsFavour(counts, axis, axis.positive, axis.negative))
-        return CountsSuffice(counts) ? axis.positive : VKEY_NO_MOVE;
-    if (CountsFavour(counts, axis, axis.negative, axis.positive))
-        return CountsSuffice(counts) ? axis.negative : VKEY_NO_MOVE;
-    return VKEY_NO_MOVE;
+    const int32_t move_cnt = counts.Moving();
+    if (move_cnt < s_moveCntEffThr &&
+        (counts.byKey[VKEY_NO_MOVE] >= move_cnt || move_cnt <= s_moveCntMinThr))
+        return VKEY_NO_MOVE;
+    // The verdicts along the axis have one direction, and are more than those of either key across.
+    const int32_t positive = counts.byKey[axis.positive];
+    const int32_t negative = counts.byKey[axis.negative];
+    const int32_t mostAcross =
+        std::max(counts.byKey[across.positive], counts.byKey[across.negative]);
+    if (positive > mostAcross && negative == 0)
+        return axis.positive;
+    return negative > mostAcross && positive == 0 ? axis.negative : VKEY_NO_MOVE;
 }
 
 }  // namespace
 
 int32_t Voting_hg_mode() {
     const int32_t calc_cnt = PairCount(s_voteInfo);
-    const Axis horizontal = {VKEY_RIGHT, VKEY_LEFT,        VKEY_DOWN,
-                             VKEY_UP,    s_voteInfo.xc[0], s_voteInfo.xc[calc_cnt]};
-    const Axis vertical = {VKEY_UP,    VKEY_DOWN,        VKEY_LEFT,
-                           VKEY_RIGHT, s_voteInfo.yc[0], s_voteInfo.yc[calc_cnt]};
+    const Axis horizontal = {VKEY_RIGHT, VKEY_LEFT, s_voteInfo.xc[0], s_voteInfo.xc[calc_cnt]};
+    const Axis vertical = {VKEY_UP, VKEY_DOWN, s_voteInfo.yc[0], s_voteInfo.yc[calc_cnt]};
     s_voteInfo.dx_sum = WrapSub(horizontal.last, horizontal.first);
     s_voteInfo.dy_sum = WrapSub(vertical.last, vertical.first);
     const VerdictCounts counts = CountVerdicts(calc_cnt);
@@ -84,7 +72,8 @@ int32_t Voting_hg_mode() {
     const int32_t ay = WrapAbs(s_voteInfo.dy_sum);
     if (WrapMul(100, std::max(ax, ay)) < WrapMul(120, std::min(ax, ay)))
         return VKEY_NO_MOVE;
-    return ax > ay ? VoteAlong(horizontal, counts) : VoteAlong(vertical, counts);
+    return ax > ay ? VoteAlong(horizontal, vertical, counts)
+                   : VoteAlong(vertical, horizontal, counts);
 }
 
 }  // namespace fpnavi
