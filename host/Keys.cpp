@@ -4,8 +4,6 @@
 #include <array>
 #include <cctype>
 
-#include "ParamTable.h"
-
 namespace host {
 
 namespace {
@@ -63,13 +61,6 @@ std::string ModeName(Mode mode) {
 std::optional<Mode> ParseMode(std::string_view name) {
     const std::optional<int32_t> value = Find(kModeNames, name);
     return value ? std::optional<Mode>(static_cast<Mode>(*value)) : std::nullopt;
-}
-
-Mode ModeOf(const ParamBlock& params) {
-    const int32_t flag = ParamValue(params, "s_modeFlag");
-    if (flag == static_cast<int32_t>(Mode::Hg))
-        return Mode::Hg;
-    return flag == static_cast<int32_t>(Mode::DoubleScan) ? Mode::DoubleScan : Mode::Fp;
 }
 
 std::string EndName(GestureEnd end) {

@@ -23,9 +23,6 @@ bool IsKey(int32_t key);
 std::string ModeName(Mode mode);
 std::optional<Mode> ParseMode(std::string_view name);
 
-// The mode that params select: s_modeFlag 1 is hg, 2 double scan, any other value acts as fp.
-Mode ModeOf(const ParamBlock& params);
-
 // lift, timeout.
 std::string EndName(GestureEnd end);
 std::optional<GestureEnd> ParseEnd(std::string_view name);

@@ -195,6 +195,13 @@ int32_t ParamValue(const ParamBlock& params, std::string_view name) {
     return params[KnownIndex(name)];
 }
 
+Mode ModeOf(const ParamBlock& params) {
+    const int32_t flag = ParamValue(params, "s_modeFlag");
+    if (flag == static_cast<int32_t>(Mode::Hg))
+        return Mode::Hg;
+    return flag == static_cast<int32_t>(Mode::DoubleScan) ? Mode::DoubleScan : Mode::Fp;
+}
+
 Geometry GeometryOf(const ParamBlock& params) {
     if (ParamValue(params, "s_modeFlag") == static_cast<int32_t>(Mode::Hg))
         return {ParamValue(params, "s_blockWidthHg"), ParamValue(params, "s_blockHeightHg"),

@@ -1,4 +1,5 @@
-// The 78 parameters by name: defaults, what the code does with each, and the geometry they give.
+// The 78 parameters by name: defaults, what the code does with each, and the mode and geometry that
+// they give.
 #ifndef FPNAVI_HOST_PARAMTABLE_H
 #define FPNAVI_HOST_PARAMTABLE_H
 
@@ -27,6 +28,9 @@ ParamBlock DefaultParams();
 // Value of the parameter in params; name must be known.
 int32_t& ParamValue(ParamBlock& params, std::string_view name);
 int32_t ParamValue(const ParamBlock& params, std::string_view name);
+
+// The mode that params select: s_modeFlag 1 is hg, 2 double scan, any other value acts as fp.
+Mode ModeOf(const ParamBlock& params);
 
 // Block grid of the raw data under params: the hg set when s_modeFlag is 1, else the fp set.
 Geometry GeometryOf(const ParamBlock& params);

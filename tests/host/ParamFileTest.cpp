@@ -81,7 +81,7 @@ TEST(Keys, ModesAndEndsHaveNames) {
     EXPECT_EQ(host::EndName(host::GestureEnd::Lift), "lift");
 }
 
-TEST(Keys, UnknownModeFlagActsAsFp) {
+TEST(ParamTable, UnknownModeFlagActsAsFp) {
     ParamBlock params = DefaultParams();
     ParamValue(params, "s_modeFlag") = 3;
     EXPECT_EQ(host::ModeOf(params), host::Mode::Fp);

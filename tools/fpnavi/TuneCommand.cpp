@@ -5,7 +5,6 @@
 #include <optional>
 
 #include "Commands.h"
-#include "Keys.h"
 #include "Output.h"
 #include "ParamFile.h"
 #include "RawImport.h"
