@@ -2,9 +2,9 @@
 
 #include <algorithm>
 
-#include "ParamTable.h"
-#include "SimMath.h"
-#include "SimSensor.h"
+#include "parameters/ParamTable.h"
+#include "simulator/SimMath.h"
+#include "simulator/SimSensor.h"
 
 namespace bench {
 namespace {

@@ -3,10 +3,10 @@
 #include <algorithm>
 #include <cstdio>
 
-#include "ParamTable.h"
-#include "SimFrame.h"
-#include "SimPath.h"
-#include "SimSensor.h"
+#include "parameters/ParamTable.h"
+#include "simulator/SimFrame.h"
+#include "simulator/SimPath.h"
+#include "simulator/SimSensor.h"
 
 namespace bench {
 namespace {

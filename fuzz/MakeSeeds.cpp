@@ -10,11 +10,11 @@
 #include <fstream>
 
 #include "FngSeed.h"
-#include "ParamFile.h"
-#include "ParamTable.h"
-#include "SimMath.h"
-#include "SimSensor.h"
-#include "Store.h"
+#include "parameters/ParamFile.h"
+#include "parameters/ParamTable.h"
+#include "simulator/SimMath.h"
+#include "simulator/SimSensor.h"
+#include "store/Store.h"
 
 namespace {
 

@@ -6,10 +6,10 @@
 
 #include "CompareRun.h"
 #include "RandomGesture.h"
-#include "SimCorpus.h"
-#include "SimFrame.h"
-#include "SimSensor.h"
 #include "Twin.h"
+#include "simulator/SimCorpus.h"
+#include "simulator/SimFrame.h"
+#include "simulator/SimSensor.h"
 
 namespace fpnavi_test {
 namespace {

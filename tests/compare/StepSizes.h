@@ -9,7 +9,7 @@
 #include <utility>
 #include <vector>
 
-#include "SimMath.h"
+#include "simulator/SimMath.h"
 
 namespace fpnavi_test {
 

@@ -4,8 +4,8 @@
 #include <unistd.h>
 
 #include "Recorder.h"
-#include "SimCorpus.h"
-#include "SimSensor.h"
+#include "simulator/SimCorpus.h"
+#include "simulator/SimSensor.h"
 
 namespace fpnavi_test {
 namespace {

@@ -5,8 +5,8 @@
 #include <set>
 
 #include "HostTestSupport.h"
-#include "Keys.h"
-#include "ParamFile.h"
+#include "parameters/ParamFile.h"
+#include "recording/Keys.h"
 
 namespace {
 

@@ -7,12 +7,12 @@
 #include <set>
 #include <vector>
 
-#include "ParamTable.h"
-#include "SimFrame.h"
-#include "SimLabel.h"
-#include "SimPath.h"
-#include "SimPresence.h"
-#include "SimSensor.h"
+#include "parameters/ParamTable.h"
+#include "simulator/SimFrame.h"
+#include "simulator/SimLabel.h"
+#include "simulator/SimPath.h"
+#include "simulator/SimPresence.h"
+#include "simulator/SimSensor.h"
 
 namespace host {
 namespace {

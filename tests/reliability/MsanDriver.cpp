@@ -11,10 +11,10 @@
 
 #include "FpNavi.h"
 #include "MsanGestures.h"
-#include "ParamTable.h"
 #include "alog_host.h"
 #include "param/NaviMode.h"
 #include "param/NaviParam.h"
+#include "parameters/ParamTable.h"
 
 namespace {
 

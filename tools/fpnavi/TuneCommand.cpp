@@ -6,10 +6,10 @@
 
 #include "Commands.h"
 #include "Output.h"
-#include "ParamFile.h"
-#include "RawImport.h"
-#include "SimFrontEnd.h"
-#include "TuneRun.h"
+#include "importers/RawImport.h"
+#include "parameters/ParamFile.h"
+#include "replay/TuneRun.h"
+#include "simulator/SimFrontEnd.h"
 
 namespace command {
 namespace {
