@@ -3,8 +3,8 @@
 #include <algorithm>
 
 #include "parameters/ParamTable.h"
-#include "simulator/SimMath.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Arithmetic.h"
+#include "simulator/Sensor.h"
 
 namespace bench {
 namespace {

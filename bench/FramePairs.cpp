@@ -7,8 +7,8 @@
 
 #include "Reference.h"
 #include "parameters/ParamTable.h"
-#include "simulator/SimFrame.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Frame.h"
+#include "simulator/Sensor.h"
 
 namespace bench {
 namespace {

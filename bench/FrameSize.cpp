@@ -4,9 +4,9 @@
 #include <cstdio>
 
 #include "parameters/ParamTable.h"
-#include "simulator/SimFrame.h"
-#include "simulator/SimPath.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Frame.h"
+#include "simulator/Path.h"
+#include "simulator/Sensor.h"
 
 namespace bench {
 namespace {

@@ -5,7 +5,7 @@
 #include <string>
 
 #include "recording/Recording.h"
-#include "simulator/SimPlan.h"
+#include "simulator/Plan.h"
 
 namespace bench {
 

@@ -8,7 +8,7 @@
 #include "Steps.h"
 #include "param/NaviLimits.h"
 #include "parameters/ParamTable.h"
-#include "simulator/SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace bench {
 namespace {

@@ -12,8 +12,8 @@
 #include "FngSeed.h"
 #include "parameters/ParamFile.h"
 #include "parameters/ParamTable.h"
-#include "simulator/SimMath.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Arithmetic.h"
+#include "simulator/Sensor.h"
 #include "store/Store.h"
 
 namespace {

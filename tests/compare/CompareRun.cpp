@@ -10,7 +10,7 @@
 #include "FpNavi.h"
 #include "RandomGesture.h"
 #include "Twin.h"
-#include "simulator/SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 namespace {

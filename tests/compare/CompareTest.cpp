@@ -7,9 +7,9 @@
 #include "CompareRun.h"
 #include "RandomGesture.h"
 #include "Twin.h"
-#include "simulator/SimCorpus.h"
-#include "simulator/SimFrame.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Corpus.h"
+#include "simulator/Frame.h"
+#include "simulator/Sensor.h"
 
 namespace fpnavi_test {
 namespace {

@@ -8,7 +8,7 @@
 
 #include "StepSizes.h"
 #include "parameters/ParamTable.h"
-#include "simulator/SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 

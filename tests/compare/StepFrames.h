@@ -11,7 +11,7 @@
 #include "FpNavi.h"
 #include "Reference.h"
 #include "StepSizes.h"
-#include "simulator/SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 

@@ -4,7 +4,7 @@
 #include "Inputs.h"
 #include "RandomGesture.h"
 #include "parameters/ParamTable.h"
-#include "simulator/SimFrontEnd.h"
+#include "simulator/FrontEnd.h"
 
 namespace fpnavi_test {
 namespace {

@@ -2,7 +2,7 @@
 #include "Inputs.h"
 #include "RandomGesture.h"
 #include "parameters/ParamTable.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Sensor.h"
 
 namespace fpnavi_test {
 namespace {

@@ -5,7 +5,7 @@
 #include "FingerDetect.h"
 #include "Reference.h"
 #include "recording/Keys.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Sensor.h"
 
 namespace fpnavi_test {
 namespace {

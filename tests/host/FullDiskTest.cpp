@@ -13,7 +13,7 @@
 #include "FngTestSupport.h"
 #include "HostTestSupport.h"
 #include "StoreTestSupport.h"
-#include "simulator/SimCorpus.h"
+#include "simulator/Corpus.h"
 #include "store/Store.h"
 
 namespace {

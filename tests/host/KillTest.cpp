@@ -16,7 +16,7 @@
 #include "ProcessSupport.h"
 #include "StoreTestSupport.h"
 #include "importers/FngImport.h"
-#include "simulator/SimCorpus.h"
+#include "simulator/Corpus.h"
 #include "store/Store.h"
 
 namespace {

@@ -11,7 +11,7 @@
 
 #include "parameters/ParamTable.h"
 #include "replay/ReplayProcess.h"
-#include "simulator/SimCorpus.h"
+#include "simulator/Corpus.h"
 
 namespace host {
 namespace {

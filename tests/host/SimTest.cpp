@@ -8,11 +8,11 @@
 #include <vector>
 
 #include "parameters/ParamTable.h"
-#include "simulator/SimFrame.h"
-#include "simulator/SimLabel.h"
-#include "simulator/SimPath.h"
-#include "simulator/SimPresence.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Frame.h"
+#include "simulator/Label.h"
+#include "simulator/Path.h"
+#include "simulator/Presence.h"
+#include "simulator/Sensor.h"
 
 namespace host {
 namespace {

@@ -9,7 +9,7 @@
 
 #include "HostTestSupport.h"
 #include "replay/TuneRun.h"
-#include "simulator/SimFrontEnd.h"
+#include "simulator/FrontEnd.h"
 
 namespace {
 

@@ -8,8 +8,8 @@
 
 #include "common/Error.h"
 #include "importers/FngImport.h"
-#include "simulator/SimFrame.h"
-#include "simulator/SimPresence.h"
+#include "simulator/Frame.h"
+#include "simulator/Presence.h"
 
 namespace presence {
 namespace {

@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "parameters/ParamTable.h"
-#include "simulator/SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 

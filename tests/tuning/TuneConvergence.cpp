@@ -14,7 +14,7 @@
 #include <vector>
 
 #include "replay/TuneRun.h"
-#include "simulator/SimFrontEnd.h"
+#include "simulator/FrontEnd.h"
 
 namespace {
 

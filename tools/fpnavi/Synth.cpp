@@ -6,7 +6,7 @@
 
 #include "Commands.h"
 #include "Output.h"
-#include "simulator/SimCorpus.h"
+#include "simulator/Corpus.h"
 #include "store/Store.h"
 
 namespace command {

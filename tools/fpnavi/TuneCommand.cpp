@@ -9,7 +9,7 @@
 #include "importers/RawImport.h"
 #include "parameters/ParamFile.h"
 #include "replay/TuneRun.h"
-#include "simulator/SimFrontEnd.h"
+#include "simulator/FrontEnd.h"
 
 namespace command {
 namespace {

@@ -1,12 +1,12 @@
 // The simulated sensor: from a plan to a recorded gesture that knows its answers.
-#ifndef FPNAVI_HOST_SIMSENSOR_H
-#define FPNAVI_HOST_SIMSENSOR_H
+#ifndef FPNAVI_HOST_SENSOR_H
+#define FPNAVI_HOST_SENSOR_H
 
 #include <string>
 
 #include "recording/Recording.h"
-#include "simulator/SimFrame.h"
-#include "simulator/SimPlan.h"
+#include "simulator/Frame.h"
+#include "simulator/Plan.h"
 
 namespace host {
 
@@ -20,4 +20,4 @@ Gesture Simulate(const SimPlan& plan, std::string id);
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMSENSOR_H
+#endif  // FPNAVI_HOST_SENSOR_H

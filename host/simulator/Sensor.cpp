@@ -1,11 +1,11 @@
 // Runs a plan: path, skin, frames, answers.
-#include "simulator/SimSensor.h"
+#include "simulator/Sensor.h"
 
 #include <utility>
 
 #include "parameters/ParamTable.h"
-#include "simulator/SimLabel.h"
-#include "simulator/SimPath.h"
+#include "simulator/Label.h"
+#include "simulator/Path.h"
 
 namespace host {
 namespace {

@@ -1,8 +1,8 @@
 // Single frames for judging presence tests: the empty sensor, and the sensor with skin on it.
 //
 // Frames have the fp size of 56 x 36 pixels and come row by row (not in block order).
-#ifndef FPNAVI_HOST_SIMPRESENCE_H
-#define FPNAVI_HOST_SIMPRESENCE_H
+#ifndef FPNAVI_HOST_PRESENCE_H
+#define FPNAVI_HOST_PRESENCE_H
 
 #include <cstdint>
 #include <vector>
@@ -21,4 +21,4 @@ std::vector<uint8_t> SimulateTouchedFrame(uint64_t seed, bool plain);
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMPRESENCE_H
+#endif  // FPNAVI_HOST_PRESENCE_H

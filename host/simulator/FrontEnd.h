@@ -2,14 +2,14 @@
 // what the tuning steers, and answers a little off from what the gain tables promise.
 //
 // Integers only, as in all of the simulator; equal plans and equal registers give equal frames.
-#ifndef FPNAVI_HOST_SIMFRONTEND_H
-#define FPNAVI_HOST_SIMFRONTEND_H
+#ifndef FPNAVI_HOST_FRONTEND_H
+#define FPNAVI_HOST_FRONTEND_H
 
 #include <cstdint>
 #include <vector>
 
 #include "parameters/ParamTable.h"
-#include "simulator/SimFrame.h"
+#include "simulator/Frame.h"
 
 namespace host {
 
@@ -64,4 +64,4 @@ class FrontEnd {
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMFRONTEND_H
+#endif  // FPNAVI_HOST_FRONTEND_H

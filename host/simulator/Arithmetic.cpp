@@ -1,5 +1,5 @@
-// Integer arithmetic of the simulator; see SimMath.h.
-#include "simulator/SimMath.h"
+// Integer arithmetic of the simulator; see Arithmetic.h.
+#include "simulator/Arithmetic.h"
 
 #include <array>
 

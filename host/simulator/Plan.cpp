@@ -1,9 +1,9 @@
 // Plans of simulated gestures, drawn from a seed.
-#include "simulator/SimPlan.h"
+#include "simulator/Plan.h"
 
 #include <array>
 
-#include "simulator/SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace host {
 namespace {

@@ -1,8 +1,8 @@
 // The mixture of a corpus.
-#include "simulator/SimCorpus.h"
+#include "simulator/Corpus.h"
 
-#include "simulator/SimMath.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Arithmetic.h"
+#include "simulator/Sensor.h"
 
 namespace host {
 namespace {

@@ -1,5 +1,5 @@
 // Presence, labels and tiers of simulated gestures.
-#include "simulator/SimLabel.h"
+#include "simulator/Label.h"
 
 #include <array>
 

@@ -1,9 +1,9 @@
 // Empty and touched single frames.
-#include "simulator/SimPresence.h"
+#include "simulator/Presence.h"
 
 #include "parameters/ParamTable.h"
-#include "simulator/SimLabel.h"
-#include "simulator/SimSensor.h"
+#include "simulator/Label.h"
+#include "simulator/Sensor.h"
 
 namespace host {
 namespace {

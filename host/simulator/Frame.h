@@ -2,14 +2,14 @@
 // pixel), and what grey levels the sensor makes of it.
 //
 // Pictures are row by row, row 0 on top. Positions are in 1/16 pixel, x right, y downwards.
-#ifndef FPNAVI_HOST_SIMFRAME_H
-#define FPNAVI_HOST_SIMFRAME_H
+#ifndef FPNAVI_HOST_FRAME_H
+#define FPNAVI_HOST_FRAME_H
 
 #include <vector>
 
 #include "recording/Recording.h"
-#include "simulator/SimMath.h"
-#include "simulator/SimSkin.h"
+#include "simulator/Arithmetic.h"
+#include "simulator/Skin.h"
 
 namespace host {
 
@@ -92,4 +92,4 @@ ZoneRegisters SenseZones(const ContactPatch& patch, const FingerState& finger,
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMFRAME_H
+#endif  // FPNAVI_HOST_FRAME_H

@@ -1,8 +1,8 @@
 // The ridge pattern: the phase of a cosine is the distance from the core line, bent by smooth
 // noise, plus one turn around each minutia; the height is the cosine with noise of three sizes.
-#include "simulator/SimSkin.h"
+#include "simulator/Skin.h"
 
-#include "simulator/SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace host {
 namespace {

@@ -1,5 +1,5 @@
 // Contact, grey levels, block order and zone registers of the simulated sensor.
-#include "simulator/SimFrame.h"
+#include "simulator/Frame.h"
 
 #include "parameters/ParamTable.h"
 

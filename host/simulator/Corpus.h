@@ -3,13 +3,13 @@
 // Modes: 45 % fp with nine tiles, 10 % fp plain, 25 % hg, 20 % double scan. Kinds in each mode:
 // 45 % strokes along an axis, 24 % rests, taps and long presses, 31 % drifts, diagonals, reversals,
 // fast, slow, small and very wide ones (see RandomPlan).
-#ifndef FPNAVI_HOST_SIMCORPUS_H
-#define FPNAVI_HOST_SIMCORPUS_H
+#ifndef FPNAVI_HOST_CORPUS_H
+#define FPNAVI_HOST_CORPUS_H
 
 #include <cstdint>
 
 #include "recording/Recording.h"
-#include "simulator/SimPlan.h"
+#include "simulator/Plan.h"
 
 namespace host {
 
@@ -21,4 +21,4 @@ Gesture SimulateCorpusGesture(uint64_t seed, int64_t index);
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMCORPUS_H
+#endif  // FPNAVI_HOST_CORPUS_H

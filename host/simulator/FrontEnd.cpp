@@ -1,5 +1,5 @@
 // Grey levels of the simulated front end, and the drawing of its plans.
-#include "simulator/SimFrontEnd.h"
+#include "simulator/FrontEnd.h"
 
 #include <algorithm>
 

@@ -2,8 +2,8 @@
 //
 // Integers only, no right shift of negative numbers, no plain char: the same bytes come out on
 // every processor and compiler. Angles are in 1/65536 turn; positions in 1/16 pixel end in 16.
-#ifndef FPNAVI_HOST_SIMMATH_H
-#define FPNAVI_HOST_SIMMATH_H
+#ifndef FPNAVI_HOST_ARITHMETIC_H
+#define FPNAVI_HOST_ARITHMETIC_H
 
 #include <cstddef>
 #include <cstdint>
@@ -67,4 +67,4 @@ constexpr int32_t ClampTo(int32_t value, int32_t low, int32_t high) {
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMMATH_H
+#endif  // FPNAVI_HOST_ARITHMETIC_H

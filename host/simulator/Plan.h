@@ -1,6 +1,6 @@
 // The plan of a simulated gesture: everything that the simulator turns into frames.
-#ifndef FPNAVI_HOST_SIMPLAN_H
-#define FPNAVI_HOST_SIMPLAN_H
+#ifndef FPNAVI_HOST_PLAN_H
+#define FPNAVI_HOST_PLAN_H
 
 #include <cstdint>
 #include <string>
@@ -68,4 +68,4 @@ SimPlan RandomPlan(uint64_t seed, Mode mode);
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMPLAN_H
+#endif  // FPNAVI_HOST_PLAN_H

@@ -2,8 +2,8 @@
 //
 // The pattern is a function of the seed and the position alone. It is computed where it is needed
 // and kept, so that a finger that moves shows the same skin again.
-#ifndef FPNAVI_HOST_SIMSKIN_H
-#define FPNAVI_HOST_SIMSKIN_H
+#ifndef FPNAVI_HOST_SKIN_H
+#define FPNAVI_HOST_SKIN_H
 
 #include <array>
 #include <cstddef>
@@ -68,4 +68,4 @@ class Skin {
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMSKIN_H
+#endif  // FPNAVI_HOST_SKIN_H

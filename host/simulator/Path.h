@@ -1,11 +1,11 @@
 // The path of a simulated finger: where it is and how hard it presses, frame by frame.
-#ifndef FPNAVI_HOST_SIMPATH_H
-#define FPNAVI_HOST_SIMPATH_H
+#ifndef FPNAVI_HOST_PATH_H
+#define FPNAVI_HOST_PATH_H
 
 #include <vector>
 
-#include "simulator/SimFrame.h"
-#include "simulator/SimPlan.h"
+#include "simulator/Frame.h"
+#include "simulator/Plan.h"
 
 namespace host {
 
@@ -16,4 +16,4 @@ std::vector<FingerState> FingerPath(const SimPlan& plan, SimRandom& random);
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMPATH_H
+#endif  // FPNAVI_HOST_PATH_H

@@ -1,5 +1,5 @@
 // Speed and pressure profiles of a simulated finger.
-#include "simulator/SimPath.h"
+#include "simulator/Path.h"
 
 namespace host {
 namespace {

@@ -1,14 +1,14 @@
 // The answers of a simulated gesture, from what is known of the motion alone: presence per frame,
 // the true key, the keys that are no error, and whether the motion is plain enough to demand the
 // key.
-#ifndef FPNAVI_HOST_SIMLABEL_H
-#define FPNAVI_HOST_SIMLABEL_H
+#ifndef FPNAVI_HOST_LABEL_H
+#define FPNAVI_HOST_LABEL_H
 
 #include <string>
 #include <vector>
 
-#include "simulator/SimFrame.h"
-#include "simulator/SimPlan.h"
+#include "simulator/Frame.h"
+#include "simulator/Plan.h"
 
 namespace host {
 
@@ -47,4 +47,4 @@ int32_t KeyOfAngle(int32_t degrees);
 
 }  // namespace host
 
-#endif  // FPNAVI_HOST_SIMLABEL_H
+#endif  // FPNAVI_HOST_LABEL_H
