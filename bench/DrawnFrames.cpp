@@ -2,9 +2,9 @@
 
 #include <algorithm>
 
-#include "ParamTable.h"
-#include "SimMath.h"
-#include "SimSensor.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Arithmetic.h"
+#include "simulator/Sensor.h"
 
 namespace bench {
 namespace {

@@ -3,7 +3,7 @@
 #define BENCH_DRAWNFRAMES_H
 
 #include "FramePairs.h"
-#include "SimFrame.h"
+#include "simulator/Frame.h"
 
 namespace bench {
 

@@ -5,10 +5,10 @@
 #include <functional>
 #include <optional>
 
-#include "ParamTable.h"
 #include "Reference.h"
-#include "SimFrame.h"
-#include "SimSensor.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Frame.h"
+#include "simulator/Sensor.h"
 
 namespace bench {
 namespace {

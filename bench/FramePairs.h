@@ -9,7 +9,7 @@
 
 #include "FpNavi.h"
 #include "FrameSize.h"
-#include "Recording.h"
+#include "recording/Recording.h"
 
 namespace bench {
 

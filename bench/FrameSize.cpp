@@ -3,10 +3,10 @@
 #include <algorithm>
 #include <cstdio>
 
-#include "ParamTable.h"
-#include "SimFrame.h"
-#include "SimPath.h"
-#include "SimSensor.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Frame.h"
+#include "simulator/Path.h"
+#include "simulator/Sensor.h"
 
 namespace bench {
 namespace {

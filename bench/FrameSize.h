@@ -4,8 +4,8 @@
 
 #include <string>
 
-#include "Recording.h"
-#include "SimPlan.h"
+#include "recording/Recording.h"
+#include "simulator/Plan.h"
 
 namespace bench {
 

@@ -4,11 +4,11 @@
 #include <algorithm>
 
 #include "DrawnFrames.h"
-#include "ParamTable.h"
 #include "Reference.h"
-#include "SimMath.h"
 #include "Steps.h"
 #include "param/NaviLimits.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Arithmetic.h"
 
 namespace bench {
 namespace {

@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "FpNavi.h"
-#include "ParamTable.h"
+#include "parameters/ParamTable.h"
 
 namespace {
 

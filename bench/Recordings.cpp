@@ -3,11 +3,11 @@
 #include <cstdio>
 #include <cstdlib>
 
-#include "Error.h"
-#include "FngImport.h"
-#include "ParamTable.h"
 #include "Peers.h"
 #include "Reference.h"
+#include "common/Error.h"
+#include "importers/FngImport.h"
+#include "parameters/ParamTable.h"
 
 namespace bench {
 namespace {

@@ -2,11 +2,11 @@
 // one. Wrong is any exception but host::Error, and a gesture that a store would not take.
 #include <cstring>
 
-#include "Error.h"
-#include "FngImport.h"
 #include "InputFile.h"
-#include "ParamTable.h"
-#include "Store.h"
+#include "common/Error.h"
+#include "importers/FngImport.h"
+#include "parameters/ParamTable.h"
+#include "store/Store.h"
 
 namespace {
 

@@ -4,7 +4,7 @@
 
 #include <string>
 
-#include "Recording.h"
+#include "recording/Recording.h"
 
 namespace fpnavi_fuzz {
 

@@ -3,7 +3,7 @@
 #define FUZZ_FUZZPARAMS_H
 
 #include "ByteSource.h"
-#include "ParamTable.h"
+#include "parameters/ParamTable.h"
 
 namespace fpnavi_fuzz {
 

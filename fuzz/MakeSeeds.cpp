@@ -10,11 +10,11 @@
 #include <fstream>
 
 #include "FngSeed.h"
-#include "ParamFile.h"
-#include "ParamTable.h"
-#include "SimMath.h"
-#include "SimSensor.h"
-#include "Store.h"
+#include "parameters/ParamFile.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Arithmetic.h"
+#include "simulator/Sensor.h"
+#include "store/Store.h"
 
 namespace {
 

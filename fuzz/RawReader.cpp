@@ -1,11 +1,11 @@
 // Raw dumps of frames and registers under any parameters. Wrong is any exception but host::Error,
 // and a gesture that a store would not take.
 #include "ByteSource.h"
-#include "Error.h"
 #include "FuzzParams.h"
 #include "InputFile.h"
-#include "RawImport.h"
-#include "Store.h"
+#include "common/Error.h"
+#include "importers/RawImport.h"
+#include "store/Store.h"
 
 namespace {
 

@@ -7,7 +7,7 @@
 #include <filesystem>
 #include <vector>
 
-#include "Files.h"
+#include "common/Files.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size);
 

@@ -1,8 +1,8 @@
 // Any bytes as a store of recordings, read by every function that reads. Wrong is any exception but
 // host::Error, and a gesture read that a store would not take.
-#include "Error.h"
 #include "InputFile.h"
-#include "Store.h"
+#include "common/Error.h"
+#include "store/Store.h"
 
 namespace {
 

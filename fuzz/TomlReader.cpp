@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <string_view>
 
-#include "Error.h"
 #include "InputFile.h"
-#include "ParamFile.h"
+#include "common/Error.h"
+#include "parameters/ParamFile.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     const std::string_view text(reinterpret_cast<const char*>(data), size);

@@ -9,8 +9,8 @@
 
 #include "FpNavi.h"
 #include "RandomGesture.h"
-#include "SimMath.h"
 #include "Twin.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 namespace {

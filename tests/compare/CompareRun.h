@@ -9,7 +9,7 @@
 #include <map>
 #include <string>
 
-#include "ParamTable.h"
+#include "parameters/ParamTable.h"
 
 namespace fpnavi_test {
 

@@ -6,10 +6,10 @@
 
 #include "CompareRun.h"
 #include "RandomGesture.h"
-#include "SimCorpus.h"
-#include "SimFrame.h"
-#include "SimSensor.h"
 #include "Twin.h"
+#include "simulator/Corpus.h"
+#include "simulator/Frame.h"
+#include "simulator/Sensor.h"
 
 namespace fpnavi_test {
 namespace {

@@ -6,9 +6,9 @@
 #include <cstdint>
 #include <vector>
 
-#include "ParamTable.h"
-#include "SimMath.h"
 #include "StepSizes.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 

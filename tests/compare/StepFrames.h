@@ -10,8 +10,8 @@
 
 #include "FpNavi.h"
 #include "Reference.h"
-#include "SimMath.h"
 #include "StepSizes.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 

@@ -5,8 +5,8 @@
 
 #include <cstdint>
 
-#include "ParamTable.h"
 #include "StepSizes.h"
+#include "parameters/ParamTable.h"
 
 namespace fpnavi_test {
 

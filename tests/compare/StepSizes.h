@@ -9,7 +9,7 @@
 #include <utility>
 #include <vector>
 
-#include "SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 

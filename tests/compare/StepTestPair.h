@@ -11,10 +11,10 @@
 #include <utility>
 #include <vector>
 
-#include "ParamTable.h"
 #include "StepFrames.h"
 #include "StepSearchParams.h"
 #include "matching/Templates.h"
+#include "parameters/ParamTable.h"
 
 namespace fpnavi_test {
 

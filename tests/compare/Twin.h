@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "Recording.h"
+#include "recording/Recording.h"
 
 namespace fpnavi_test {
 

@@ -2,9 +2,9 @@
 #include <algorithm>
 
 #include "Inputs.h"
-#include "ParamTable.h"
 #include "RandomGesture.h"
-#include "SimFrontEnd.h"
+#include "parameters/ParamTable.h"
+#include "simulator/FrontEnd.h"
 
 namespace fpnavi_test {
 namespace {

@@ -5,7 +5,7 @@
 #include <set>
 
 #include "HashedCalls.h"
-#include "ParamTable.h"
+#include "parameters/ParamTable.h"
 
 namespace fpnavi_test {
 namespace {

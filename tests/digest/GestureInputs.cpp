@@ -1,8 +1,8 @@
 // Gestures: of the simulated sensor, and moving pictures under parameters from sane to hostile.
 #include "Inputs.h"
-#include "ParamTable.h"
 #include "RandomGesture.h"
-#include "SimSensor.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Sensor.h"
 
 namespace fpnavi_test {
 namespace {

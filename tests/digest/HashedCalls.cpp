@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cstdlib>
 
-#include "ParamTable.h"
+#include "parameters/ParamTable.h"
 
 namespace fpnavi_test {
 namespace {

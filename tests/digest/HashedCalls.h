@@ -9,8 +9,8 @@
 #include <vector>
 
 #include "Digest.h"
-#include "Recording.h"
 #include "Side.h"
+#include "recording/Recording.h"
 
 namespace fpnavi_test {
 

@@ -3,7 +3,7 @@
 
 #include <algorithm>
 
-#include "SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 namespace {

@@ -4,8 +4,8 @@
 #include <unistd.h>
 
 #include "Recorder.h"
-#include "SimCorpus.h"
-#include "SimSensor.h"
+#include "simulator/Corpus.h"
+#include "simulator/Sensor.h"
 
 namespace fpnavi_test {
 namespace {

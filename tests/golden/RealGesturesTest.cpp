@@ -4,9 +4,9 @@
 #include <cstdlib>
 #include <filesystem>
 
-#include "FngImport.h"
-#include "Keys.h"
-#include "ReplayProcess.h"
+#include "importers/FngImport.h"
+#include "recording/Keys.h"
+#include "replay/ReplayProcess.h"
 
 namespace fpnavi_test {
 namespace {

@@ -3,9 +3,9 @@
 #include <algorithm>
 
 #include "FingerDetect.h"
-#include "Keys.h"
 #include "Reference.h"
-#include "SimSensor.h"
+#include "recording/Keys.h"
+#include "simulator/Sensor.h"
 
 namespace fpnavi_test {
 namespace {

@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-#include "Recording.h"
+#include "recording/Recording.h"
 
 namespace fpnavi_test {
 

@@ -11,7 +11,7 @@
 
 #include "GestureBuilder.h"
 #include "HostTestSupport.h"
-#include "Store.h"
+#include "store/Store.h"
 
 namespace {
 

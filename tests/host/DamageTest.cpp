@@ -10,14 +10,14 @@
 #include <functional>
 #include <regex>
 
-#include "FngImport.h"
 #include "FngTestSupport.h"
 #include "HostTestSupport.h"
-#include "ParamFile.h"
 #include "ProcessSupport.h"
-#include "RawImport.h"
-#include "Store.h"
 #include "StoreTestSupport.h"
+#include "importers/FngImport.h"
+#include "importers/RawImport.h"
+#include "parameters/ParamFile.h"
+#include "store/Store.h"
 
 namespace {
 

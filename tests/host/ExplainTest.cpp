@@ -4,8 +4,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include "Explain.h"
 #include "GestureBuilder.h"
+#include "replay/Explain.h"
 
 namespace {
 

@@ -3,9 +3,9 @@
 
 #include <utility>
 
-#include "FngImport.h"
 #include "FngTestSupport.h"
 #include "HostTestSupport.h"
+#include "importers/FngImport.h"
 
 namespace {
 

@@ -10,8 +10,8 @@
 #include "CommandSupport.h"
 #include "FngTestSupport.h"
 #include "HostTestSupport.h"
-#include "ParamFile.h"
-#include "Store.h"
+#include "parameters/ParamFile.h"
+#include "store/Store.h"
 
 namespace {
 

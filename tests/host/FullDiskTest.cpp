@@ -12,9 +12,9 @@
 #include "CommandSupport.h"
 #include "FngTestSupport.h"
 #include "HostTestSupport.h"
-#include "SimCorpus.h"
-#include "Store.h"
 #include "StoreTestSupport.h"
+#include "simulator/Corpus.h"
+#include "store/Store.h"
 
 namespace {
 

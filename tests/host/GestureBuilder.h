@@ -7,8 +7,8 @@
 #include <string>
 #include <vector>
 
-#include "ParamTable.h"
-#include "Recording.h"
+#include "parameters/ParamTable.h"
+#include "recording/Recording.h"
 
 namespace host_test {
 

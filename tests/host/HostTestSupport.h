@@ -13,9 +13,9 @@
 #include <string>
 #include <vector>
 
-#include "Error.h"
-#include "ParamTable.h"
-#include "Recording.h"
+#include "common/Error.h"
+#include "parameters/ParamTable.h"
+#include "recording/Recording.h"
 
 namespace host_test {
 

@@ -3,9 +3,9 @@
 
 #include <algorithm>
 
-#include "FngImport.h"
 #include "FngTestSupport.h"
 #include "HostTestSupport.h"
+#include "importers/FngImport.h"
 
 namespace {
 

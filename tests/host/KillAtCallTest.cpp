@@ -11,8 +11,8 @@
 
 #include "HostTestSupport.h"
 #include "ProcessSupport.h"
-#include "Store.h"
 #include "StoreTestSupport.h"
+#include "store/Store.h"
 
 namespace {
 

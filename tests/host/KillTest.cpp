@@ -11,13 +11,13 @@
 #include <random>
 #include <thread>
 
-#include "FngImport.h"
 #include "FngTestSupport.h"
 #include "HostTestSupport.h"
 #include "ProcessSupport.h"
-#include "SimCorpus.h"
-#include "Store.h"
 #include "StoreTestSupport.h"
+#include "importers/FngImport.h"
+#include "simulator/Corpus.h"
+#include "store/Store.h"
 
 namespace {
 

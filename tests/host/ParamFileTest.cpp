@@ -5,8 +5,8 @@
 #include <set>
 
 #include "HostTestSupport.h"
-#include "Keys.h"
-#include "ParamFile.h"
+#include "parameters/ParamFile.h"
+#include "recording/Keys.h"
 
 namespace {
 
@@ -81,7 +81,7 @@ TEST(Keys, ModesAndEndsHaveNames) {
     EXPECT_EQ(host::EndName(host::GestureEnd::Lift), "lift");
 }
 
-TEST(Keys, UnknownModeFlagActsAsFp) {
+TEST(ParamTable, UnknownModeFlagActsAsFp) {
     ParamBlock params = DefaultParams();
     ParamValue(params, "s_modeFlag") = 3;
     EXPECT_EQ(host::ModeOf(params), host::Mode::Fp);

@@ -4,7 +4,7 @@
 #include <limits>
 
 #include "HostTestSupport.h"
-#include "RawImport.h"
+#include "importers/RawImport.h"
 
 namespace {
 

@@ -8,11 +8,11 @@
 #include <filesystem>
 #include <fstream>
 
-#include "Error.h"
 #include "GestureBuilder.h"
-#include "ReplayCorpus.h"
-#include "ReplayProcess.h"
-#include "Store.h"
+#include "common/Error.h"
+#include "replay/ReplayCorpus.h"
+#include "replay/ReplayProcess.h"
+#include "store/Store.h"
 
 namespace {
 

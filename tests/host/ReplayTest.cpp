@@ -2,9 +2,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "Error.h"
 #include "GestureBuilder.h"
-#include "Replay.h"
+#include "common/Error.h"
+#include "replay/Replay.h"
 
 namespace {
 

@@ -9,9 +9,9 @@
 #include <string>
 #include <vector>
 
-#include "ParamTable.h"
-#include "ReplayProcess.h"
-#include "SimCorpus.h"
+#include "parameters/ParamTable.h"
+#include "replay/ReplayProcess.h"
+#include "simulator/Corpus.h"
 
 namespace host {
 namespace {

@@ -7,12 +7,12 @@
 #include <set>
 #include <vector>
 
-#include "ParamTable.h"
-#include "SimFrame.h"
-#include "SimLabel.h"
-#include "SimPath.h"
-#include "SimPresence.h"
-#include "SimSensor.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Frame.h"
+#include "simulator/Label.h"
+#include "simulator/Path.h"
+#include "simulator/Presence.h"
+#include "simulator/Sensor.h"
 
 namespace host {
 namespace {

@@ -2,10 +2,10 @@
 // before, which have none.
 #include <gmock/gmock.h>
 
-#include "GestureChecksum.h"
 #include "HostTestSupport.h"
-#include "Store.h"
 #include "StoreTestSupport.h"
+#include "store/GestureChecksum.h"
+#include "store/Store.h"
 
 namespace {
 

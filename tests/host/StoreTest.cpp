@@ -5,11 +5,11 @@
 #include <stdexcept>
 #include <utility>
 
-#include "FngImport.h"
 #include "HostTestSupport.h"
-#include "Redact.h"
-#include "Store.h"
 #include "StoreTestSupport.h"
+#include "importers/FngImport.h"
+#include "recording/Redact.h"
+#include "store/Store.h"
 
 namespace {
 

@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "HostTestSupport.h"
-#include "Store.h"
+#include "store/Store.h"
 
 namespace host_test {
 

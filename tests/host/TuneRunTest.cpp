@@ -8,8 +8,8 @@
 #include <numeric>
 
 #include "HostTestSupport.h"
-#include "SimFrontEnd.h"
-#include "TuneRun.h"
+#include "replay/TuneRun.h"
+#include "simulator/FrontEnd.h"
 
 namespace {
 

@@ -15,9 +15,9 @@
 
 #include "FingerDetect.h"
 #include "FpNavi.h"
-#include "ParamTable.h"
 #include "PresenceFrames.h"
 #include "param/NaviParam.h"
+#include "parameters/ParamTable.h"
 #include "presence/FingerStatus.h"
 
 namespace {

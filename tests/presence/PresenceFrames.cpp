@@ -6,10 +6,10 @@
 #include <map>
 #include <utility>
 
-#include "Error.h"
-#include "FngImport.h"
-#include "SimFrame.h"
-#include "SimPresence.h"
+#include "common/Error.h"
+#include "importers/FngImport.h"
+#include "simulator/Frame.h"
+#include "simulator/Presence.h"
 
 namespace presence {
 namespace {

@@ -5,8 +5,8 @@
 #include <cstdint>
 #include <vector>
 
-#include "ParamTable.h"
-#include "SimMath.h"
+#include "parameters/ParamTable.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 

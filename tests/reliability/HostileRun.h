@@ -4,7 +4,7 @@
 
 #include <cstdint>
 
-#include "Recording.h"
+#include "recording/Recording.h"
 
 namespace fpnavi_test {
 

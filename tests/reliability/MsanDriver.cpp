@@ -11,9 +11,9 @@
 
 #include "FpNavi.h"
 #include "MsanGestures.h"
-#include "ParamTable.h"
 #include "alog_host.h"
 #include "param/NaviParam.h"
+#include "parameters/ParamTable.h"
 
 namespace {
 

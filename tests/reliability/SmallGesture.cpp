@@ -1,6 +1,6 @@
 #include "SmallGesture.h"
 
-#include "SimMath.h"
+#include "simulator/Arithmetic.h"
 
 namespace fpnavi_test {
 namespace {

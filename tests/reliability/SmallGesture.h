@@ -5,8 +5,8 @@
 #include <cstdint>
 #include <vector>
 
-#include "ParamTable.h"
-#include "Recording.h"
+#include "parameters/ParamTable.h"
+#include "recording/Recording.h"
 
 namespace fpnavi_test {
 

@@ -1,12 +1,14 @@
 """Which file includes which, and where that breaks the order of the tree.
 
-The order of the module's folders is the one that docs/architecture.md states.
+The order of the folders of the module and of the host side is the one that docs/architecture.md
+states.
 """
 import pathlib
 import posixpath
 import re
 
 MODULE = 'fpsvc/callib/FpNavi'
+HOST = 'host'
 _PUBLIC = 'fpsvc/callib/inc'
 _LOG = 'devhal/alog'
 
@@ -17,27 +19,40 @@ _ALLOWED = {
     _PUBLIC: [],
     _LOG: [],
     'examples': [_PUBLIC, _LOG],
-    'host': [MODULE, _PUBLIC, _LOG],
-    'tools': ['host', MODULE, _PUBLIC, _LOG],
+    HOST: [_PUBLIC],
+    'host/replay': [HOST, MODULE, _PUBLIC],
+    'tools': [HOST, MODULE, _PUBLIC, _LOG],
     'tests/reference': [],
     'tests/install': [_PUBLIC, _LOG],
-    'tests/support': ['host', MODULE, _PUBLIC, _LOG],
-    'tests': ['host', MODULE, _PUBLIC, _LOG],
-    'fuzz': ['tests', 'host', MODULE, _PUBLIC, _LOG],
-    'bench': ['tests', 'host', MODULE, _PUBLIC, _LOG],
+    'tests/support': [HOST, MODULE, _PUBLIC, _LOG],
+    'tests': [HOST, MODULE, _PUBLIC, _LOG],
+    'fuzz': ['tests', HOST, MODULE, _PUBLIC, _LOG],
+    'bench': ['tests', HOST, MODULE, _PUBLIC, _LOG],
 }
 # Where the compiler looks for a header, besides the folder of the file that includes it.
-_SEARCHED = [MODULE, _PUBLIC, 'devhal/alog/inc', _LOG, 'host', 'tests/support', 'tests/reference',
+_SEARCHED = [MODULE, _PUBLIC, 'devhal/alog/inc', _LOG, HOST, 'tests/support', 'tests/reference',
              'tests/compare', 'tests/host', 'tests/golden', 'tests/digest', 'tests/presence',
              'tests/reliability', 'fuzz', 'bench', 'examples', 'tools/fpnavi']
+# Directories whose folders have an order, and how the sentence that states it begins.
+_ORDERED = {MODULE: 'The module', HOST: 'The host side'}
 _QUOTED = re.compile(r'^\s*#\s*include\s+"([^"]+)"', re.MULTILINE)
 
 
-def folders_in_order(root):
-    """The module's folders as docs/architecture.md has them, the lowest first."""
+def folders_in_order(root, directory):
+    """Folders of MODULE or HOST as docs/architecture.md has them, the lowest first."""
     text = (pathlib.Path(root) / 'docs/architecture.md').read_text(encoding='utf-8')
-    stated = re.search(r'folders in this order:((?:\s+`\w+`[,.])+)', text)
+    sentence = f'{_ORDERED[directory]} has its folders in this order:'.replace(' ', r'\s+')
+    stated = re.search(sentence + r'((?:\s+`\w+`[,.])+)', text)
     return re.findall(r'\w+', stated.group(1)) if stated else []
+
+
+def folders_with_sources(includes, directory):
+    """Folders of a directory that hold sources; a source that is in none has its own name there."""
+    return {_folder(file, directory) for file in includes if file.startswith(f'{directory}/')}
+
+
+def _folder(file, directory):
+    return file.removeprefix(f'{directory}/').partition('/')[0]
 
 
 def read_includes(root):
@@ -75,16 +90,16 @@ def strangers(includes):
     return found
 
 
-def upward(includes, order):
-    """Includes of a folder of the module by a file of a folder before it."""
-    found = []
-    for file, headers in includes.items():
-        for header in headers:
-            if file.startswith(f'{MODULE}/') and header.startswith(f'{MODULE}/'):
-                here, there = (order.index(name.split('/')[3]) for name in (file, header))
-                if there > here:
-                    found.append(f'{file} includes {header}')
-    return found
+def upward(includes, directory, order):
+    """Includes of a folder of MODULE or HOST by a file of a folder before it in the order."""
+    def place(file):
+        folder = _folder(file, directory)
+        return order.index(folder) if folder in order else len(order)
+
+    inside = f'{directory}/'
+    return [f'{file} includes {header}' for file, headers in includes.items()
+            for header in headers if file.startswith(inside) and header.startswith(inside)
+            and place(header) > place(file)]
 
 
 def circles(includes):

@@ -8,6 +8,7 @@ import includes
 
 _ROOT = pathlib.Path(__file__).parents[2]
 _MODULE = includes.MODULE
+_HOST = includes.HOST
 
 
 class Includes(unittest.TestCase):
@@ -15,16 +16,21 @@ class Includes(unittest.TestCase):
 
     @classmethod
     def setUpClass(cls):
-        cls.order = includes.folders_in_order(_ROOT)
+        cls.orders = {directory: includes.folders_in_order(_ROOT, directory)
+                      for directory in (_MODULE, _HOST)}
         cls.includes = includes.read_includes(_ROOT)
 
-    def test_every_folder_of_the_module_has_its_place(self):
-        folders = {path.name for path in (_ROOT / _MODULE).iterdir() if path.is_dir()}
-        self.assertEqual(folders, set(self.order))
-        self.assertEqual(len(folders), len(self.order))
+    def test_every_folder_has_its_place(self):
+        for directory, order in self.orders.items():
+            folders = includes.folders_with_sources(self.includes, directory)
+            self.assertEqual(sorted(folders), sorted(order))
+
+    def test_no_folder_of_the_host_side_has_the_name_of_one_of_the_module(self):
+        self.assertEqual(set(self.orders[_MODULE]) & set(self.orders[_HOST]), set())
 
     def test_folders_include_none_above_them(self):
-        self.assertEqual(includes.upward(self.includes, self.order), [])
+        for directory, order in self.orders.items():
+            self.assertEqual(includes.upward(self.includes, directory, order), [])
 
     def test_nothing_includes_itself_by_others(self):
         found = includes.circles(self.includes)
@@ -41,7 +47,9 @@ class PlantedIncludes(unittest.TestCase):
         self._directory = tempfile.TemporaryDirectory()
         self.addCleanup(self._directory.cleanup)
         self.root = pathlib.Path(self._directory.name)
-        self.write('docs/architecture.md', 'folders in this order: `low`,\n`high`. Then\n`more`.')
+        self.write('docs/architecture.md',
+                   'The module has its\nfolders in this order: `low`,\n`high`. Then\n`more`.\n'
+                   'The host side has its folders in this order: `first`, `last`.')
 
     def write(self, path, text):
         (self.root / path).parent.mkdir(parents=True, exist_ok=True)
@@ -50,28 +58,54 @@ class PlantedIncludes(unittest.TestCase):
     def write_module(self, path, *headers):
         self.write(f'{_MODULE}/{path}', ''.join(f'#include "{name}"\n' for name in headers))
 
+    def write_host(self, path, *headers):
+        self.write(f'{_HOST}/{path}', ''.join(f'#include "{name}"\n' for name in headers))
+
     def read(self):
         return includes.read_includes(self.root)
 
     def test_order_ends_with_the_sentence(self):
-        self.assertEqual(includes.folders_in_order(self.root), ['low', 'high'])
+        self.assertEqual(includes.folders_in_order(self.root, _MODULE), ['low', 'high'])
+        self.assertEqual(includes.folders_in_order(self.root, _HOST), ['first', 'last'])
 
     def test_no_order_without_the_sentence(self):
         self.write('docs/architecture.md', 'The folders: `low`, `high`.')
-        self.assertEqual(includes.folders_in_order(self.root), [])
+        self.assertEqual(includes.folders_in_order(self.root, _MODULE), [])
+        self.assertEqual(includes.folders_in_order(self.root, _HOST), [])
+
+    def test_folders_with_sources(self):
+        self.write_module('low/A.h')
+        self.write_host('first/B.cpp')
+        self.write_host('C.h')
+        self.assertEqual(includes.folders_with_sources(self.read(), _MODULE), {'low'})
+        self.assertEqual(includes.folders_with_sources(self.read(), _HOST), {'first', 'C.h'})
 
     def test_upward_include(self):
         self.write_module('high/B.h')
         self.write_module('low/A.cpp', 'high/B.h')
-        self.assertEqual(includes.upward(self.read(), ['low', 'high']),
+        self.assertEqual(includes.upward(self.read(), _MODULE, ['low', 'high']),
                          [f'{_MODULE}/low/A.cpp includes {_MODULE}/high/B.h'])
-        self.assertEqual(includes.upward(self.read(), ['high', 'low']), [])
+        self.assertEqual(includes.upward(self.read(), _MODULE, ['high', 'low']), [])
 
     def test_upward_include_by_a_relative_path(self):
         self.write_module('high/B.h')
         self.write(f'{_MODULE}/low/A.cpp', '  #  include "../high/B.h"\n')
-        self.assertEqual(includes.upward(self.read(), ['low', 'high']),
+        self.assertEqual(includes.upward(self.read(), _MODULE, ['low', 'high']),
                          [f'{_MODULE}/low/A.cpp includes {_MODULE}/high/B.h'])
+
+    def test_upward_include_of_the_host_side(self):
+        self.write_host('last/B.h')
+        self.write_host('first/A.cpp', 'last/B.h')
+        self.assertEqual(includes.upward(self.read(), _HOST, ['first', 'last']),
+                         ['host/first/A.cpp includes host/last/B.h'])
+        self.assertEqual(includes.upward(self.read(), _HOST, ['last', 'first']), [])
+        self.assertEqual(includes.upward(self.read(), _MODULE, ['first', 'last']), [])
+
+    def test_include_of_a_header_without_a_folder_is_upward(self):
+        self.write_host('B.h')
+        self.write_host('last/A.cpp', 'B.h')
+        self.assertEqual(includes.upward(self.read(), _HOST, ['first', 'last']),
+                         ['host/last/A.cpp includes host/B.h'])
 
     def test_circle_of_headers(self):
         self.write_module('low/A.h', 'low/B.h')
@@ -94,10 +128,17 @@ class PlantedIncludes(unittest.TestCase):
         self.assertEqual(includes.circles(self.read()), [])
 
     def test_module_that_includes_the_host_side(self):
-        self.write('host/Store.h', '')
-        self.write_module('low/A.h', 'Store.h')
+        self.write_host('first/A.h')
+        self.write_module('low/A.h', 'first/A.h')
         self.assertEqual(includes.strangers(self.read()),
-                         [f'{_MODULE}/low/A.h includes host/Store.h'])
+                         [f'{_MODULE}/low/A.h includes host/first/A.h'])
+
+    def test_host_side_that_includes_the_module(self):
+        self.write_module('low/A.h')
+        self.write_host('first/A.h', 'low/A.h')
+        self.write_host('replay/A.h', 'low/A.h', 'first/A.h')
+        self.assertEqual(includes.strangers(self.read()),
+                         [f'host/first/A.h includes {_MODULE}/low/A.h'])
 
     def test_model_that_includes_the_module(self):
         self.write_module('low/A.h')

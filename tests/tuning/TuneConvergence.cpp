@@ -13,8 +13,8 @@
 #include <string>
 #include <vector>
 
-#include "SimFrontEnd.h"
-#include "TuneRun.h"
+#include "replay/TuneRun.h"
+#include "simulator/FrontEnd.h"
 
 namespace {
 

@@ -6,7 +6,7 @@
 #include <CLI/CLI.hpp>
 #include <functional>
 
-#include "Explain.h"
+#include "replay/Explain.h"
 
 namespace command {
 

@@ -2,9 +2,9 @@
 #include <fmt/core.h>
 
 #include "Commands.h"
-#include "Keys.h"
 #include "Output.h"
 #include "ResultLines.h"
+#include "recording/Keys.h"
 
 namespace command {
 namespace {

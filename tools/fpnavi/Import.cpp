@@ -6,13 +6,13 @@
 #include <set>
 
 #include "Commands.h"
-#include "Error.h"
-#include "FngImport.h"
-#include "Keys.h"
 #include "Output.h"
-#include "ParamFile.h"
-#include "RawImport.h"
-#include "Store.h"
+#include "common/Error.h"
+#include "importers/FngImport.h"
+#include "importers/RawImport.h"
+#include "parameters/ParamFile.h"
+#include "recording/Keys.h"
+#include "store/Store.h"
 
 namespace command {
 namespace {

@@ -2,10 +2,10 @@
 #include <memory>
 
 #include "Commands.h"
-#include "Keys.h"
 #include "Output.h"
-#include "ParamFile.h"
-#include "ParamTable.h"
+#include "parameters/ParamFile.h"
+#include "parameters/ParamTable.h"
+#include "recording/Keys.h"
 
 namespace command {
 namespace {

@@ -5,12 +5,12 @@
 #include <memory>
 
 #include "Commands.h"
-#include "Error.h"
-#include "Keys.h"
 #include "Output.h"
-#include "ReplayCorpus.h"
 #include "ResultLines.h"
-#include "Store.h"
+#include "common/Error.h"
+#include "recording/Keys.h"
+#include "replay/ReplayCorpus.h"
+#include "store/Store.h"
 
 namespace command {
 namespace {

@@ -2,7 +2,7 @@
 
 #include <fmt/core.h>
 
-#include "Keys.h"
+#include "recording/Keys.h"
 
 namespace command {
 

@@ -7,7 +7,7 @@
 #include <string>
 
 #include "Output.h"
-#include "Replay.h"
+#include "replay/Replay.h"
 
 namespace command {
 

@@ -6,8 +6,8 @@
 
 #include "Commands.h"
 #include "Output.h"
-#include "SimCorpus.h"
-#include "Store.h"
+#include "simulator/Corpus.h"
+#include "store/Store.h"
 
 namespace command {
 namespace {

@@ -5,12 +5,11 @@
 #include <optional>
 
 #include "Commands.h"
-#include "Keys.h"
 #include "Output.h"
-#include "ParamFile.h"
-#include "RawImport.h"
-#include "SimFrontEnd.h"
-#include "TuneRun.h"
+#include "importers/RawImport.h"
+#include "parameters/ParamFile.h"
+#include "replay/TuneRun.h"
+#include "simulator/FrontEnd.h"
 
 namespace command {
 namespace {

@@ -9,7 +9,6 @@
 #include <algorithm>
 
 #include "FingerDetect.h"
-#include "base/ByteSums.h"
 #include "base/GreyHistogram.h"
 #include "base/NaviMath.h"
 #include "gesture/Gesture.h"

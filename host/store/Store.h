@@ -1,0 +1,94 @@
+// Recordings in a SQLite file: one gesture or a million. docs/recordings.md has the tables.
+//
+// The frames are pictures of fingerprints: biometric data. Whoever stores them keeps them safe;
+// recording/Redact.h takes the fingerprint out.
+#ifndef FPNAVI_HOST_STORE_H
+#define FPNAVI_HOST_STORE_H
+
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "recording/Recording.h"
+
+namespace host {
+
+class Database;
+class Transaction;
+
+// One open store. Every member function throws Error with the file's name; an Append that throws
+// leaves the store as it was. Use one Store from one thread; several processes may open the same
+// file, also for appending.
+class Store {
+  public:
+    enum class IfExists {
+        Fail,     // a file of that name is an error
+        Replace,  // a store (or an empty file) of that name is replaced; anything else is an error
+    };
+
+    // A new store, open for appending. A kill at any moment leaves what was there before, or the
+    // new store.
+    static Store Create(const std::string& path, IfExists ifExists = IfExists::Fail);
+
+    // An existing one. Error for a file that is missing, empty, truncated, no SQLite file, another
+    // program's database or of a newer schema. Appending brings an older schema to this one.
+    static Store OpenForReading(const std::string& path);
+    static Store OpenForAppending(const std::string& path);
+
+    Store(Store&& other) noexcept;
+    Store& operator=(Store&& other) noexcept;
+    ~Store();
+
+    // Adds gesture with all its frames in one transaction: after a kill at any moment it is there
+    // completely or not at all, and once Append has returned it stays. Error for an id that is
+    // taken and for a gesture that CheckGesture refuses.
+    void Append(const Gesture& gesture);
+
+    // Gestures that go in together: what is appended while it lives is there after its Commit, or
+    // not at all. Other processes that append wait for it.
+    class Batch {
+      public:
+        explicit Batch(Store& store);  // store must outlive it
+        ~Batch();
+        Batch(const Batch&) = delete;
+        Batch& operator=(const Batch&) = delete;
+
+        void Commit();
+
+      private:
+        std::unique_ptr<Transaction> m_transaction;
+    };
+
+    int64_t Count() const;
+
+    // In the order of appending; Error when the index of the ids has another number.
+    std::vector<std::string> Ids() const;
+
+    bool Contains(const std::string& id) const;
+
+    // The gesture called id; Error when there is none or its rows are not sound.
+    Gesture Read(const std::string& id) const;
+
+    // Calls visit with each gesture in the order of appending, one in memory at a time. What visit
+    // throws ends it.
+    void ForEach(const std::function<void(const Gesture&)>& visit) const;
+
+    const std::string& Path() const;
+
+  private:
+    Store(std::unique_ptr<Database> database, bool appending);
+    void Close() noexcept;
+
+    std::unique_ptr<Database> m_database;
+    bool m_appending = false;
+};
+
+// What every stored gesture fulfils: a non-empty id, mode and geometry as params give them, image
+// sides of 1 to 4096 pixels, every frame of the geometry's size, known keys, end and presence.
+// Error at "gesture 'id'" of file otherwise.
+void CheckGesture(const Gesture& gesture, const std::string& file);
+
+}  // namespace host
+
+#endif  // FPNAVI_HOST_STORE_H

@@ -1,0 +1,237 @@
+// Reading a store: every value is checked, since the file may come from anywhere.
+#include <fmt/format.h>
+
+#include <limits>
+#include <nlohmann/json.hpp>
+
+#include "common/Error.h"
+#include "recording/Keys.h"
+#include "store/GestureChecksum.h"
+#include "store/Store.h"
+#include "store/StoreSchema.h"
+
+namespace host {
+
+namespace {
+
+constexpr int64_t kInt32Min = std::numeric_limits<int32_t>::min();
+constexpr int64_t kInt32Max = std::numeric_limits<int32_t>::max();
+constexpr int64_t kUint32Max = std::numeric_limits<uint32_t>::max();
+
+// The columns that GestureFromRow reads, in its order.
+#define FPNAVI_GESTURE_COLUMNS(checksum)                                                     \
+    "SELECT g.seq, g.id, p.params, g.mode, g.block_width, g.block_height, g.block_col_num, " \
+    "g.block_row_num, g.frame_count, g.end, g.label, g.accepted, g.tier, g.tags, "           \
+    "g.library_version, g.notes, " checksum                                                  \
+    " FROM gesture g LEFT JOIN param_block p ON p.id = g.param_block "
+
+constexpr const char* kReadOne = FPNAVI_GESTURE_COLUMNS("g.checksum") "WHERE g.id = ?";
+constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS("g.checksum") "ORDER BY g.seq";
+constexpr const char* kReadOneOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "WHERE g.id = ?";
+constexpr const char* kReadAllOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "ORDER BY g.seq";
+#undef FPNAVI_GESTURE_COLUMNS
+
+constexpr const char* kReadFrames =
+    "SELECT frame_index, raw, reg24, reg28, x16, y16, presence FROM frame WHERE gesture = ? "
+    "ORDER BY frame_index";
+
+std::vector<std::string> TextList(const Statement& row, int column, const char* name) {
+    const nlohmann::json list = nlohmann::json::parse(row.Text(column), nullptr, false);
+    std::vector<std::string> texts;
+    if (!list.is_array())
+        row.FailRow(fmt::format("{} is no JSON list of texts", name));
+    for (const nlohmann::json& entry : list) {
+        if (!entry.is_string())
+            row.FailRow(fmt::format("{} is no JSON list of texts", name));
+        texts.push_back(entry.get<std::string>());
+    }
+    return texts;
+}
+
+int32_t KeyFrom(const Statement& row, const std::string& name) {
+    const std::optional<int32_t> key = ParseKey(name);
+    if (!key)
+        row.FailRow(
+            fmt::format("'{}' is no key, expected NONE, UP, DOWN, RIGHT, LEFT or NO_MOVE", name));
+    return *key;
+}
+
+int32_t BlockSide(const Statement& row, int column) {
+    return static_cast<int32_t>(row.Integer(column, 1, kMaxImageSide));
+}
+
+void ReadNames(const Statement& row, Gesture& gesture) {
+    const std::string mode = row.Text(3);
+    const std::optional<Mode> knownMode = ParseMode(mode);
+    if (!knownMode)
+        row.FailRow(fmt::format("mode '{}', expected fp, hg or ds", mode));
+    gesture.mode = *knownMode;
+    const std::string end = row.Text(9);
+    const std::optional<GestureEnd> knownEnd = ParseEnd(end);
+    if (!knownEnd)
+        row.FailRow(fmt::format("end '{}', expected lift or timeout", end));
+    gesture.end = *knownEnd;
+    if (!row.IsNull(10))
+        gesture.label = KeyFrom(row, row.Text(10));
+    for (const std::string& name : TextList(row, 11, "accepted"))
+        gesture.accepted.push_back(KeyFrom(row, name));
+}
+
+std::optional<int32_t> OptionalInteger(const Statement& row, int column, int64_t lowest,
+                                       int64_t highest) {
+    if (row.IsNull(column))
+        return std::nullopt;
+    return static_cast<int32_t>(row.Integer(column, lowest, highest));
+}
+
+RecordedFrame FrameFromRow(const Statement& row) {
+    RecordedFrame frame;
+    frame.raw = row.Blob(1);
+    frame.reg24 = static_cast<uint32_t>(row.Integer(2, 0, kUint32Max));
+    frame.reg28 = static_cast<uint32_t>(row.Integer(3, 0, kUint32Max));
+    frame.x16 = OptionalInteger(row, 4, kInt32Min, kInt32Max);
+    frame.y16 = OptionalInteger(row, 5, kInt32Min, kInt32Max);
+    const std::optional<int32_t> presence = OptionalInteger(row, 6, -1, 1);
+    if (presence)
+        frame.presence = static_cast<Presence>(*presence);
+    return frame;
+}
+
+void ReadFrames(const Database& database, int64_t seq, int64_t count, Gesture& gesture) {
+    Statement row(database, kReadFrames, "read the frames");
+    const std::string place = GesturePlace(gesture.id);
+    row.Bind(1, seq);
+    row.At(place);
+    for (int64_t i = 0; row.Step(); ++i) {
+        row.At(fmt::format("{}, frame {}", place, i));
+        if (i >= count || row.Integer(0, 0, kInt32Max) != i) {
+            row.At(place);
+            row.FailRow(fmt::format("has a frame of index {}, expected 0 to {} without gaps",
+                                    row.Integer(0, INT64_MIN, INT64_MAX), count - 1));
+        }
+        gesture.frames.push_back(FrameFromRow(row));
+    }
+    if (static_cast<int64_t>(gesture.frames.size()) != count) {
+        row.At(place);
+        row.FailRow(fmt::format("has {} frames, expected {}", gesture.frames.size(), count));
+    }
+}
+
+// Both numbers in one statement, so that no other process can append between them.
+constexpr const char* kCountTwice =
+    "SELECT (SELECT count(*) FROM gesture NOT INDEXED), "
+    "(SELECT count(*) FROM gesture INDEXED BY sqlite_autoindex_gesture_1)";
+
+// A damaged page can take rows with it; the index of the ids then still has them.
+void CheckNoneIsMissing(const Database& database) {
+    Statement row(database, kCountTwice, "count the gestures");
+    row.Step();
+    const int64_t rows = row.Integer(0, 0, INT64_MAX);
+    const int64_t ids = row.Integer(1, 0, INT64_MAX);
+    if (rows != ids)
+        throw Error(
+            database.Path(), "table gesture",
+            fmt::format("{} rows, expected {} as its index has: the file is damaged", rows, ids));
+}
+
+void CheckChecksum(const Statement& row, int column, const Gesture& gesture) {
+    if (row.IsNull(column))
+        return;
+    const int64_t stored = row.Integer(column, 0, kUint32Max);
+    const uint32_t computed = GestureChecksum(gesture);
+    if (stored != computed)
+        row.FailRow(
+            fmt::format("its content has checksum {:#010x}, expected {:#010x} as stored: "
+                        "damaged, or changed by another program",
+                        computed, stored));
+}
+
+Gesture GestureFromRow(const Database& database, Statement& row) {
+    Gesture gesture;
+    row.At(fmt::format("gesture row {}", row.Integer(0, INT64_MIN, INT64_MAX)));
+    gesture.id = row.Text(1);
+    const std::string place = GesturePlace(gesture.id);
+    row.At(place);
+    gesture.params = ParamsFromJson(row.Text(2), database.Path(), place);
+    ReadNames(row, gesture);
+    gesture.geometry = {BlockSide(row, 4), BlockSide(row, 5), BlockSide(row, 6), BlockSide(row, 7)};
+    gesture.tier = row.Text(12);
+    gesture.tags = TextList(row, 13, "tags");
+    gesture.libraryVersion = row.Text(14);
+    gesture.notes = row.Text(15);
+    ReadFrames(database, row.Integer(0, INT64_MIN, INT64_MAX), row.Integer(8, 0, kInt32Max),
+               gesture);
+    CheckGesture(gesture, database.Path());
+    row.At(place);
+    CheckChecksum(row, 16, gesture);
+    return gesture;
+}
+
+}  // namespace
+
+Store::Store(std::unique_ptr<Database> database, bool appending)
+    : m_database(std::move(database)), m_appending(appending) {}
+
+Store::Store(Store&& other) noexcept = default;
+
+Store& Store::operator=(Store&& other) noexcept {
+    if (this != &other) {
+        Close();
+        m_database = std::move(other.m_database);
+        m_appending = other.m_appending;
+    }
+    return *this;
+}
+
+Store::~Store() {
+    Close();
+}
+
+Store Store::OpenForReading(const std::string& path) {
+    return Store(OpenStoreFile(path, false), false);
+}
+
+const std::string& Store::Path() const {
+    return m_database->Path();
+}
+
+int64_t Store::Count() const {
+    return m_database->Number("SELECT count(*) FROM gesture", "count the gestures");
+}
+
+std::vector<std::string> Store::Ids() const {
+    CheckNoneIsMissing(*m_database);
+    Statement row(*m_database, "SELECT id FROM gesture ORDER BY seq", "list the gestures");
+    std::vector<std::string> ids;
+    while (row.Step())
+        ids.push_back(row.Text(0));
+    return ids;
+}
+
+bool Store::Contains(const std::string& id) const {
+    Statement row(*m_database, "SELECT 1 FROM gesture WHERE id = ?", "look for a gesture");
+    row.Bind(1, id);
+    return row.Step();
+}
+
+Gesture Store::Read(const std::string& id) const {
+    const bool sums = StoreVersion(*m_database) > kStoreSchemaWithoutChecksums;
+    Statement row(*m_database, sums ? kReadOne : kReadOneOfVersion1, "read the gesture");
+    row.At(GesturePlace(id));
+    row.Bind(1, id);
+    if (!row.Step())
+        throw Error(Path(), GesturePlace(id), "is not in the store, expected one of its ids");
+    return GestureFromRow(*m_database, row);
+}
+
+void Store::ForEach(const std::function<void(const Gesture&)>& visit) const {
+    CheckNoneIsMissing(*m_database);
+    const bool sums = StoreVersion(*m_database) > kStoreSchemaWithoutChecksums;
+    Statement row(*m_database, sums ? kReadAll : kReadAllOfVersion1, "read the gestures");
+    while (row.Step()) {
+        visit(GestureFromRow(*m_database, row));
+        row.At("");
+    }
+}
+
+}  // namespace host
