@@ -58,8 +58,8 @@ inline Span Meet(const Span& span, const Span& other, int32_t offset) {
 
 inline constexpr int32_t kBandMax = 3;  // border, centre, border
 
-// Places p of one axis that meet p + offset of the other frame: count spans in ascending order,
-// none empty, none overlapping another.
+// Places p of one axis that meet p + offset of the other frame: count spans, none empty. Those of
+// columns are in ascending order, and none overlaps another.
 struct Meeting {
     int32_t offset;
     int32_t places;  // in all spans
@@ -82,8 +82,7 @@ struct ColumnPiece {
     Bytes16 mask[4];
 };
 
-// Columns that meet, and the first piece of them: with at most 64 columns there is no other. head
-// is undefined when none meets.
+// Columns that meet, and the first piece of them, empty when none meets.
 struct Columns {
     Meeting meeting;
     ColumnPiece head;
@@ -94,18 +93,17 @@ struct Columns {
 Columns CutColumns(const Meeting& meeting);
 
 // Pixel (r, c) of the first frame meets (r + offset of rows, c + offset of columns) of the second,
-// for each place r of rows and c of columns. All of these lie inside both frames; columns are not
-// empty.
+// which has the same size, for each place r of rows and c of columns. All of these lie inside both.
 struct Pairing {
     const Meeting* rows;
     const Columns* columns;
 };
 
-// Pixels of the pairing that are finger in both frames: at most 2^24.
+// Pixels of the pairing that are finger in both frames, those of two spans twice: at most 2^25.
 int32_t CommonArea(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing);
 
-// Sum of the grey differences over the pairing's common area, at most 255 * 2^24. Once the sum
-// reaches limit it may stop and return what it has, at least limit.
+// Sum of the grey differences over the pairing's common area. Once the sum reaches limit it may
+// stop and return what it has, at least limit.
 int64_t DifferenceSum(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing,
                       int64_t limit);
 
