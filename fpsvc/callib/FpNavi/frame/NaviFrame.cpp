@@ -17,11 +17,6 @@ NaviFrame_t s_fullImagePrev;
 
 namespace {
 
-// The bit rows of the finger fill, and as many words of scratch.
-int32_t FillBytes(int32_t width, int32_t height) {
-    return 2 * height * WordsOf(width) * static_cast<int32_t>(sizeof(uint64_t));
-}
-
 void ReleaseBuffers(NaviFrame_t* img) {
     std::free(img->pData);
     img->pData = nullptr;
@@ -53,7 +48,9 @@ int32_t RoomStart(int32_t width, int32_t height) {
 
 int32_t FrameBytes(int32_t width, int32_t height) {
     const int32_t mask = width * height + kLanes;
-    return RoomStart(width, height) + std::max(mask, FillBytes(width, height));
+    // The bit rows of the finger fill, and as many words of scratch.
+    const int32_t fill = 2 * height * WordsOf(width) * static_cast<int32_t>(sizeof(uint64_t));
+    return RoomStart(width, height) + std::max(mask, fill);
 }
 
 int32_t ImgInit(NaviFrame_t* img, int32_t i_start, int32_t i_end, int32_t j_start, int32_t j_end,
@@ -65,18 +62,13 @@ int32_t ImgInit(NaviFrame_t* img, int32_t i_start, int32_t i_end, int32_t j_star
     const int32_t width = j_end - j_start;
     if (!ReplaceBuffers(img, FrameBytes(width, height)))
         return -1;
-    img->height = height;
-    img->width = width;
+    *img = {width, height, img->pData, img->pType, 0, 0, 0, 0};
     // Rows of the whole width follow each other in data too.
     const uint8_t* const first = data + i_start * s_imageWidth + j_start;
     const int32_t run = width == s_imageWidth ? width * height : width;
     for (int32_t at = 0, from = 0; at < width * height; at += run, from += s_imageWidth)
         std::memcpy(img->pData + at, first + from, static_cast<size_t>(run));
     std::memset(img->pType, 0, static_cast<size_t>(width * height));
-    img->cvr = 0;
-    img->range = 0;
-    img->xc = 0;
-    img->yc = 0;
     return 0;
 }
 
@@ -97,10 +89,8 @@ int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src) {
     const size_t pixels = static_cast<size_t>(img_src->width * img_src->height);
     std::memcpy(img_dst->pData, img_src->pData, pixels);
     std::memcpy(img_dst->pType, img_src->pType, pixels);
-    img_dst->cvr = img_src->cvr;
-    img_dst->xc = img_src->xc;
-    img_dst->yc = img_src->yc;
-    img_dst->range = img_src->range;
+    *img_dst = {img_src->width, img_src->height, img_dst->pData, img_dst->pType,
+                img_src->cvr,   img_src->range,  img_src->xc,    img_src->yc};
     return 0;
 }
 

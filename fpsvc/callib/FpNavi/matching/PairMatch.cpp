@@ -4,7 +4,6 @@
 #include <cstdlib>
 
 #include "base/NaviMath.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "gesture/NaviVoteInfo.h"
 #include "matching/MatchSearch.h"

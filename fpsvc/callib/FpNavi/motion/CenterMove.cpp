@@ -28,10 +28,7 @@ bool Dominates(int32_t a, int32_t b) {
 // The coverage changes much for the displacement way: the finger is pressed or lifted, it does not
 // slide.
 bool IsDeformation(int32_t dcvr, int32_t way) {
-    if (!IsHg() || way == 0)
-        return false;
-    const int32_t deform_rate = dcvr / way;
-    return WrapAbs(deform_rate) > s_deformThreshold;
+    return IsHg() && way != 0 && WrapAbs(dcvr / way) > s_deformThreshold;
 }
 
 // The finger's pixels, and the sums of their columns and rows. A frame of 4096 x 4096 pixels has
@@ -42,33 +39,28 @@ struct FingerSums {
     int64_t row;
 };
 
-// The sums of sixteen columns from first on, of which the frame has the first count; 1 <= count <=
-// 16. All three fit 32 bits: at most 16 * 4096 = 2^16 pixels, column sums below 2^16 * 15, row sums
-// below 2^16 * 2^12 / 2 = 2^27.
-FingerSums SumStrip(const NaviFrame_t& img, int32_t first, int32_t count) {
-    const Bytes16 one = Splat16(1);
-    const Bytes16 ones = And16(FirstBytes(count), one);
-    const Bytes16 columns = And16(FirstBytes(count), LaneNumbers());
-    Sums pixels = NoSums();
-    Sums columnSums = NoSums();
-    Sums rowSums = NoSums();
-    for (int32_t row = img.height - 1; row >= 0; --row) {
-        rowSums = AddSums(rowSums, pixels);
-        const Bytes16 finger = Equal16(Load16(img.pType + row * img.width + first), one);
-        pixels = AddBytes(pixels, And16(finger, ones));
-        columnSums = AddBytes(columnSums, And16(finger, columns));
-    }
-    const int64_t all = Total(pixels);
-    return {all, Total(columnSums) + first * all, Total(rowSums)};
-}
-
+// The partial sums of sixteen columns fit 32 bits: at most 16 * 4096 = 2^16 pixels, column sums
+// below 2^16 * 15, row sums below 2^16 * 2^12 / 2 = 2^27.
 FingerSums SumFinger(const NaviFrame_t& img) {
+    const Bytes16 one = Splat16(1);
     FingerSums sums = {0, 0, 0};
     for (int32_t first = 0; first < img.width; first += kLanes) {
-        const FingerSums strip = SumStrip(img, first, std::min(img.width - first, kLanes));
-        sums.count += strip.count;
-        sums.column += strip.column;
-        sums.row += strip.row;
+        const Bytes16 inside = FirstBytes(std::min(img.width - first, kLanes));
+        const Bytes16 ones = And16(inside, one);
+        const Bytes16 columns = And16(inside, LaneNumbers());
+        Sums pixels = NoSums();
+        Sums columnSums = NoSums();
+        Sums rowSums = NoSums();
+        for (int32_t row = img.height - 1; row >= 0; --row) {
+            rowSums = AddSums(rowSums, pixels);
+            const Bytes16 finger = Equal16(Load16(img.pType + row * img.width + first), one);
+            pixels = AddBytes(pixels, And16(finger, ones));
+            columnSums = AddBytes(columnSums, And16(finger, columns));
+        }
+        const int64_t count = Total(pixels);
+        sums.count += count;
+        sums.column += Total(columnSums) + first * count;
+        sums.row += Total(rowSums);
     }
     return sums;
 }
@@ -85,11 +77,10 @@ int32_t GetCenterAndCoverage(NaviFrame_t* img) {
     if (!HasPixels(img))
         return -1;
     const FingerSums sums = SumFinger(*img);
-    const int64_t size = int64_t{img->width} * img->height;
     const bool any = sums.count != 0;
     img->xc = any ? static_cast<int32_t>(Centre(sums.column, sums.count, img->width) - 50) : 0;
     img->yc = any ? static_cast<int32_t>(50 - Centre(sums.row, sums.count, img->height)) : 0;
-    img->cvr = static_cast<int32_t>(100 * sums.count / size);
+    img->cvr = static_cast<int32_t>(100 * sums.count / (img->width * img->height));
     return 0;
 }
 
@@ -114,18 +105,16 @@ int32_t CalcCenterMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr,
         *verdict = visible ? VKEY_NO_MOVE : VKEY_NONE;
         return 0;
     }
-    int32_t way = 0;
-    if (Dominates(ax, ay)) {
-        *verdict = dx <= 0 ? VKEY_LEFT : VKEY_RIGHT;
-        way = dx;
-    } else if (Dominates(ay, ax)) {
-        *verdict = dy <= 0 ? VKEY_DOWN : VKEY_UP;
-        way = dy;
-    } else {
+    const bool alongX = Dominates(ax, ay);
+    if (!alongX && !Dominates(ay, ax)) {
         *verdict = VKEY_NONE;  // diagonal
         return 0;
     }
-    if (IsDeformation(img_curr->cvr - img_prev->cvr, way)) {
+    if (alongX)
+        *verdict = dx <= 0 ? VKEY_LEFT : VKEY_RIGHT;
+    else
+        *verdict = dy <= 0 ? VKEY_DOWN : VKEY_UP;
+    if (IsDeformation(img_curr->cvr - img_prev->cvr, alongX ? dx : dy)) {
         *verdict = VKEY_NO_MOVE;
         voteInfo->dx_ct[calc_cnt] = 0;
         voteInfo->dy_ct[calc_cnt] = 0;
