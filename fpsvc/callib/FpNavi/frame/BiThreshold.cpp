@@ -36,8 +36,7 @@ struct GreyClass {
     // class that is empty stays empty.
     uint32_t next = 1;
 
-    // Makes next that of the present pixels, whose mean is not below that before. A rise of 0 or 1
-    // takes no division.
+    // The mean of the present pixels is not below that before. A rise of 0 or 1 takes no division.
     void FollowMean() {
         next += next * count <= sum ? 1U : 0U;
         if (next * count <= sum && count != 0)
@@ -46,15 +45,15 @@ struct GreyClass {
     int32_t Mean() const { return count != 0 ? static_cast<int32_t>(next) - 1 : 0; }
     // The share of the variance between the classes, 0 for an empty class. A class has at most 254
     // levels of 255 pixels, and means are -254..255: the share is at most 64770 * 508^2 < 2^34.
-    uint64_t Share(int32_t nextToMean) const {
+    int64_t Share(int32_t nextToMean) const {
         const int32_t distance = static_cast<int32_t>(next) - nextToMean;
-        return uint64_t{count} * static_cast<uint32_t>(distance * distance);
+        return int64_t{count} * (distance * distance);
     }
 };
 
 }  // namespace
 
-BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size) {
+void SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size, int32_t* thr, int32_t* scale) {
     GreyClass lower;
     GreyClass upper;
     uint32_t total = 0;  // greys of all pixels: at most 255 * 2^24 < 2^32
@@ -69,13 +68,14 @@ BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size) {
     // Deliberate: a total from 2^31 on is negative.
     const int32_t nextToMean = Wrap(total) / size + 1;
     int32_t max = 0;
-    BiThreshold best = {0, 0};
-    for (int32_t thr = 1; thr < kGreyMax; ++thr) {
-        // The level below thr becomes lower. An empty one leaves the threshold before as good.
-        const uint32_t added = WrappedCount(hist[thr - 1]);
-        if (added == 0 && thr != 1)
+    *thr = 0;
+    *scale = 0;
+    for (int32_t t = 1; t < kGreyMax; ++t) {
+        // The level below t becomes lower. An empty one leaves the threshold before as good.
+        const uint32_t added = WrappedCount(hist[t - 1]);
+        if (added == 0 && t != 1)
             continue;
-        const uint32_t greys = static_cast<uint32_t>(thr - 1) * added;
+        const uint32_t greys = static_cast<uint32_t>(t - 1) * added;
         lower.count += added;
         lower.sum += greys;
         upper.count -= added;
@@ -83,14 +83,13 @@ BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size) {
         lower.FollowMean();
         upper.FollowMean();
         // Deliberate: the low 32 bits, signed.
-        const int32_t variance =
-            Wrap(static_cast<int64_t>(upper.Share(nextToMean) + lower.Share(nextToMean)));
+        const int32_t variance = Wrap(upper.Share(nextToMean) + lower.Share(nextToMean));
         if (variance > max) {
             max = variance;
-            best = {thr, std::abs(lower.Mean() - upper.Mean())};
+            *thr = t;
+            *scale = std::abs(lower.Mean() - upper.Mean());
         }
     }
-    return best;
 }
 
 int32_t CalcBiThr(const NaviFrame_t* img, int32_t* thr, int32_t* scale) {
@@ -99,9 +98,7 @@ int32_t CalcBiThr(const NaviFrame_t* img, int32_t* thr, int32_t* scale) {
     const int32_t size = img->width * img->height;
     int32_t hist[kGreyLevels];
     CountBytes(img->pData, size, hist);
-    const BiThreshold split = SplitGreys(hist, size);
-    *thr = split.thr;
-    *scale = split.scale;
+    SplitGreys(hist, size, thr, scale);
     return 0;
 }
 

@@ -4,10 +4,11 @@
 // each column.
 // Observation: a pixel lies between two marked ones of its column when one is marked at or above
 // it and one at or below it.
-// Algorithm: a row is a run of 64-bit words. Between two marked pixels of a row is a mask; columns
-// are ORs upwards, which are kept, and downwards, 64 columns at a time.
+// Algorithm: a row is a run of 64-bit words. A row is filled by masks, 64 columns by ORs upwards,
+// which are kept, and downwards.
 #include <algorithm>
 #include <cstdint>
+#include <cstring>
 
 #include "base/BitRows.h"
 #include "base/NaviMath.h"
@@ -16,17 +17,6 @@
 
 namespace fpnavi {
 namespace {
-
-constexpr int32_t kPasses = 2;
-
-// Marks the pixels of grey <= thr in bits [out], height rows of words.
-void MarkDark(const NaviFrame_t& img, uint8_t thr, uint64_t* bits) {
-    const uint8_t* grey = img.pData;
-    for (int32_t row = 0; row < img.height; ++row, grey += img.width) {
-        for (int32_t c = 0; c < img.width; c += kWordPixels)
-            *bits++ = AtMostBits(grey + c, std::min(img.width - c, kWordPixels), thr);
-    }
-}
 
 // Marks all from the first to the last marked pixel of a row.
 void FillRow(uint64_t* row, int32_t words) {
@@ -82,12 +72,17 @@ void GetFingerRidge(NaviFrame_t* img, int32_t thr) {
     auto* const bits = reinterpret_cast<uint64_t*>(img->pData + RoomStart(img->width, img->height));
     const int32_t words = WordsOf(img->width);
     const int32_t count = img->height * words;
-    // No grey is below 0, and none above 255.
-    if (thr >= 0)
-        MarkDark(*img, ClampToGrey(thr), bits);
-    else
-        std::fill_n(bits, count, uint64_t{0});
-    for (int32_t pass = 0; pass < kPasses; ++pass) {
+    if (thr < 0) {  // no grey is below 0
+        std::memset(img->pType, 0, static_cast<size_t>(img->width * img->height));
+        return;
+    }
+    uint64_t* word = bits;
+    for (int32_t row = 0; row < img->height; ++row) {
+        const uint8_t* const grey = img->pData + row * img->width;
+        for (int32_t c = 0; c < img->width; c += kWordPixels)
+            *word++ = AtMostBits(grey + c, std::min(img->width - c, kWordPixels), ClampToGrey(thr));
+    }
+    for (int32_t pass = 0; pass < 2; ++pass) {
         for (int32_t at = 0; at < count; at += words)
             FillRow(bits + at, words);
         FillColumns(bits, bits + count, words, count);

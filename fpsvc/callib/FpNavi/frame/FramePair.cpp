@@ -2,13 +2,11 @@
 // hundred displacements of a pair.
 //
 // Observation: with masks of 0 and 255 a difference that does not count is |0 - 0|, so that sixteen
-// pixel pairs take a few operations without a branch. The columns that meet are the same in all
-// rows.
+// pixel pairs take a few operations without a branch. The columns that meet are those of all rows.
 //
-// Algorithm: the masks of both frames are made once for each pair, the masks of the columns once
-// for each displacement of columns. Columns are cut into pieces of at most 64, of which the masks
-// stay in registers; a piece runs down all rows, and every four rows its sum is compared with the
-// limit.
+// Algorithm: the masks of both frames are made once for each pair, those of the columns once for
+// each displacement of columns. Columns are cut into pieces of at most 64; a piece runs down all
+// rows, and every four rows its sum is compared with the limit.
 #include "frame/FramePair.h"
 
 #include <algorithm>
@@ -54,7 +52,6 @@ const Span& MiddleFirst(const Meeting& rows, int32_t s) {
 template <bool kDiffs, int32_t kSteps>
 int64_t SumPiece(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing,
                  const ColumnPiece& piece, int64_t limit) {
-    const Bytes16 one = Splat16(1);
     const int32_t offset = pairing.rows->offset * first.width + pairing.columns->meeting.offset;
     const auto addRow = [&](Sums sums, int32_t row) {
         int32_t at = row * first.width + piece.column;
@@ -64,7 +61,7 @@ int64_t SumPiece(const LaidFrame& first, const LaidFrame& second, const Pairing&
             const Bytes16 common = And16(finger, piece.mask[step]);
             sums = kDiffs ? AddDiffs(sums, And16(Load16(first.grey + at), common),
                                      And16(Load16(second.grey + at + offset), common))
-                          : AddBytes(sums, And16(common, one));
+                          : AddBytes(sums, And16(common, Splat16(1)));
         }
         return sums;
     };

@@ -1,6 +1,5 @@
-// Two frames laid out for comparison, and the comparison itself: the grey differences of the pixels
-// that are finger in both, at any displacement. Owns nothing; the mask of a frame lies in the space
-// behind its classes.
+// Two frames laid out for comparison, and the grey differences of the pixels that are finger in
+// both, at any displacement. Owns nothing; a frame's mask lies in the space behind its classes.
 #ifndef FPNAVI_FRAMEPAIR_H
 #define FPNAVI_FRAMEPAIR_H
 
@@ -26,8 +25,7 @@ struct LaidFrame {
 // into the buffers of img and is valid until one of them changes.
 LaidFrame LayOut(const NaviFrame_t& img);
 
-// The working state of a frame pair: a value that the driver of the pair makes and passes to all
-// steps.
+// The working state of a frame pair: the driver of the pair makes it and passes it to all steps.
 struct FramePair {
     LaidFrame prev;
     LaidFrame curr;
@@ -86,8 +84,6 @@ struct ColumnPiece {
 struct Columns {
     Meeting meeting;
     ColumnPiece head;
-
-    bool Empty() const { return meeting.count == 0; }
 };
 
 Columns CutColumns(const Meeting& meeting);

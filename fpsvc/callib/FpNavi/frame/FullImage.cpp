@@ -54,15 +54,12 @@ void SpreadPlane(const uint8_t* source, const NaviFrame_t& full, uint8_t value, 
     }
 }
 
-// Tiles of negative size cannot be cut out, and negative gaps would lay tiles over each other.
-bool TilesUsable() {
+// The nine tiles are usable, and img has buffers and their size. Tiles of negative size cannot be
+// cut out, and negative gaps would lay tiles over each other.
+bool TilesFit(const NaviFrame_t* img) {
     return s_boundWidth >= 0 && s_centerWidth >= 0 && s_gapWidth >= 0 && s_boundHeight >= 0 &&
-           s_centerHeight >= 0 && s_gapHeight >= 0 && FullImageGeometryUsable();
-}
-
-// img has buffers and the size of the nine usable tiles.
-bool SourceFits(const NaviFrame_t* img) {
-    return img != nullptr && img->pData != nullptr && img->pType != nullptr &&
+           s_centerHeight >= 0 && s_gapHeight >= 0 && FullImageGeometryUsable() && img != nullptr &&
+           img->pData != nullptr && img->pType != nullptr &&
            img->width == s_centerWidth + 2 * s_boundWidth &&
            img->height == s_centerHeight + 2 * s_boundHeight;
 }
@@ -70,7 +67,7 @@ bool SourceFits(const NaviFrame_t* img) {
 }  // namespace
 
 int32_t GetFullImg(const NaviFrame_t* img, NaviFrame_t* full_img) {
-    if (full_img == nullptr || !TilesUsable() || !SourceFits(img))
+    if (full_img == nullptr || !TilesFit(img))
         return -1;
     full_img->width = img->width + 2 * s_gapWidth;
     full_img->height = img->height + 2 * s_gapHeight;

@@ -6,6 +6,8 @@
 
 #include "base/BitRows.h"
 #include "base/NaviSimd.h"
+#include "param/NaviLimits.h"
+#include "param/NaviMode.h"
 #include "param/NaviParam.h"
 
 namespace fpnavi {
@@ -36,10 +38,10 @@ bool ReplaceBuffers(NaviFrame_t* img, int32_t bytes) {
     const size_t size = static_cast<size_t>(bytes);
     img->pData = static_cast<uint8_t*>(std::malloc(size));
     img->pType = static_cast<uint8_t*>(std::malloc(size));
-    if (img->pData != nullptr && img->pType != nullptr)
-        return true;
-    ReleaseBuffers(img);
-    return false;
+    const bool made = img->pData != nullptr && img->pType != nullptr;
+    if (!made)
+        ReleaseBuffers(img);
+    return made;
 }
 
 int32_t RoomStart(int32_t width, int32_t height) {
@@ -95,3 +97,27 @@ int32_t ImgCopy(NaviFrame_t* img_dst, const NaviFrame_t* img_src) {
 }
 
 }  // namespace fpnavi
+
+int32_t GetNaviBlock(const uint8_t* p_data_origin, int32_t width, int32_t /*height*/,
+                     uint8_t* p_data_resort) {
+    using namespace fpnavi;
+    if (p_data_origin == nullptr || p_data_resort == nullptr || !ImageGeometryUsable())
+        return -1;
+    const int32_t blkNum = s_blockRowNum * s_blockColNum;
+    for (int32_t b = 0; b < blkNum; ++b) {
+        const int32_t top = b / s_blockColNum * s_blockHeight;
+        const int32_t left = b % s_blockColNum * s_blockWidth;
+        for (int32_t row = 0; row < s_blockHeight; ++row)
+            std::memcpy(p_data_resort + (top + row) * s_imageWidth + left,
+                        p_data_origin + (b * s_blockHeight + row) * s_blockWidth,
+                        static_cast<size_t>(s_blockWidth));
+    }
+    // The first row of a double scan carries no finger when only vertical keys are wanted: the row
+    // below takes its place. In increasing order, so that a width other than the image's repeats.
+    if (s_directionControlFlag == kDirectionVertical && IsDoubleScan()) {
+        const int32_t size = s_imageWidth * s_imageHeight;  // at most 2^24
+        for (int32_t i = 0; i < width && i < size - width; ++i)
+            p_data_resort[i] = p_data_resort[width + i];
+    }
+    return 0;
+}

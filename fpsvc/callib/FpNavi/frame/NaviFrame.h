@@ -42,19 +42,15 @@ int32_t GetFullImg(const NaviFrame_t* img, NaviFrame_t* full_img);
 bool ReplaceBuffers(NaviFrame_t* img, int32_t bytes);
 
 // Both buffers of a navigation frame (not of a full image) have space behind the pixels for what
-// steps derive from them. A step fills this space before it reads it: nothing in it is kept from
-// call to call.
-//
-//   pData: greys, width * height bytes; then the bit rows of the finger fill
-//   pType: classes, width * height bytes; then the mask of LayOut, width * height bytes
-//
-// The space has at least 16 bytes more than the mask, so that a step of sixteen bytes may read past
-// the last pixel, and past the last byte of the mask.
+// steps derive from them: pData for the bit rows of the finger fill, pType for the mask of LayOut,
+// width * height bytes. A step fills the space before it reads it: nothing is kept from call to
+// call. The space has at least 16 bytes more than the mask, so that a step of sixteen bytes may
+// read past the last pixel, and past the last byte of the mask.
 
 // Bytes of each buffer of a frame of these sides, 1..4096: below 2^26.
 int32_t FrameBytes(int32_t width, int32_t height);
 
-// Index of the first byte of that space in a buffer of a frame of these sides: a multiple of 16.
+// Index of the first byte of that space: a multiple of 16.
 int32_t RoomStart(int32_t width, int32_t height);
 
 // img has both buffers and at least one pixel.

@@ -1,5 +1,4 @@
-// ImgPreProcess: the steps of each mode, in their order; and StretchRange, the last of them: the
-// greys of the finger area stretched to the full scale.
+// ImgPreProcess: the steps of each mode, in their order. StretchRange: the last of them.
 //
 // Requirement: in the finger area, the grey level of the cut-off percentile becomes 0, that of the
 // opposite percentile the full scale; greys in between linearly, truncated. Other pixels stay.
@@ -35,21 +34,17 @@ void MarkDarkPixels(NaviFrame_t* img) {
     }
 }
 
-// Bit i is set when pixel p + i is not finger: 64 pixels, fewer at the end of the frame.
-uint64_t BackgroundBits(const NaviFrame_t& img, int32_t p) {
-    const Bytes16 one = Splat16(1);
-    const int32_t count = std::min(img.width * img.height - p, kWordPixels);
-    uint64_t finger = 0;
-    for (int32_t i = 0; i < count; i += kLanes)
-        finger |= static_cast<uint64_t>(TopBits16(Equal16(Load16(img.pType + p + i), one))) << i;
-    return ~finger & FirstBits(count);
-}
-
 // Subtracts the pixels outside the finger area from hist [in, out]. Returns the number of the rest.
 int32_t TakeOutBackground(const NaviFrame_t& img, int32_t (&hist)[kGreyLevels]) {
+    const Bytes16 one = Splat16(1);
+    const int32_t size = img.width * img.height;
     ByteCounter counter;
-    for (int32_t p = 0; p < img.width * img.height; p += kWordPixels) {
-        for (uint64_t bits = BackgroundBits(img, p); bits != 0;) {
+    for (int32_t p = 0; p < size; p += kWordPixels) {
+        const int32_t count = std::min(size - p, kWordPixels);
+        uint64_t finger = 0;  // bit i: pixel p + i
+        for (int32_t i = 0; i < count; i += kLanes)
+            finger |= uint64_t{TopBits16(Equal16(Load16(img.pType + p + i), one))} << i;
+        for (uint64_t bits = ~finger & FirstBits(count); bits != 0;) {
             const int32_t start = __builtin_ctzll(bits);
             const uint64_t after = ~(bits >> start);
             const int32_t run = after != 0 ? __builtin_ctzll(after) : kWordPixels;
@@ -86,10 +81,9 @@ void StretchPixels(int32_t min, uint32_t range, uint32_t scale, NaviFrame_t* img
 // StretchRange of a frame with pixels. hist [in, out]: all greys of img, counted; those of the
 // finger area afterwards.
 //
-// Limits are in hundredths of a pixel. The cumulative count crosses each limit once at most, and
-// not at all when level 0 alone exceeds it: the level is then 0. For a limit >= 0, count > limit /
-// 100 (truncated) is the same as 100 * count > limit. Where no level exceeds the low limit, the
-// high one is 0 or less, so that nothing is stretched.
+// Limits are in hundredths of a pixel. Where level 0 alone exceeds a limit, the percentile is 0.
+// For a limit >= 0, count > limit / 100 (truncated) is the same as 100 * count > limit. Where no
+// level exceeds the low limit, the high one is 0 or less, so that nothing is stretched.
 void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t (&hist)[kGreyLevels]) {
     const int32_t cnt = TakeOutBackground(*img, hist);  // at most 2^24
     const int32_t lo = WrapMul(cnt, s_cutOffPercent);
@@ -116,7 +110,6 @@ int32_t StretchRange(NaviFrame_t* img, uint8_t scale) {
     return 0;
 }
 
-// The greys are counted once, for the threshold and for the stretch.
 int32_t ImgPreProcess(NaviFrame_t* img) {
     if (IsHg()) {
         MarkDarkPixels(img);
@@ -127,9 +120,11 @@ int32_t ImgPreProcess(NaviFrame_t* img) {
     const int32_t size = img->width * img->height;
     int32_t hist[kGreyLevels];
     CountBytes(img->pData, size, hist);
-    const BiThreshold split = SplitGreys(hist, size);
-    img->range = static_cast<uint8_t>(split.scale);  // at most 254
-    GetFingerRidge(img, split.thr);
+    int32_t thr;
+    int32_t scale;  // at most 254
+    SplitGreys(hist, size, &thr, &scale);
+    img->range = static_cast<uint8_t>(scale);
+    GetFingerRidge(img, thr);
     StretchFinger(img, kGreyMax, hist);
     return 0;
 }

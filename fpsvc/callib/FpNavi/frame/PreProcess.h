@@ -19,11 +19,7 @@ int32_t ImgPreProcess(NaviFrame_t* img);
 int32_t CalcBiThr(const NaviFrame_t* img, int32_t* thr, int32_t* scale);
 
 // CalcBiThr of size pixels. hist [in]: their greys, counted.
-struct BiThreshold {
-    int32_t thr;
-    int32_t scale;
-};
-BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size);
+void SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size, int32_t* thr, int32_t* scale);
 
 // Builds the finger area in pType: the pixels of grey <= thr and all between two of them in a row
 // or a column, twice over. img has pixels, and room behind them (FrameBytes).

@@ -49,10 +49,8 @@ int32_t CalcDoubleScanMove(const uint8_t* pPrev, const uint8_t* pCurr, NaviVoteI
 int32_t GetDoubleScanNaviBlock(uint32_t gReg24, uint32_t gReg28) {
     using namespace fpnavi;
     std::memcpy(DoubleScanZonePrev, DoubleScanZoneCurr, sizeof DoubleScanZonePrev);
-    // Bit 31 of gReg28 is cell 0, bit 31 of gReg24 cell 32.
-    for (int32_t count = 0; count < kZoneCells; ++count) {
-        const uint32_t reg = count < 32 ? gReg28 : gReg24;
-        DoubleScanZoneCurr[count] = static_cast<uint8_t>((reg >> (31 - count % 32)) & 1U);
-    }
+    const uint64_t cells = uint64_t{gReg28} << 32 | gReg24;  // the top bit is cell 0
+    for (int32_t count = 0; count < kZoneCells; ++count)
+        DoubleScanZoneCurr[count] = static_cast<uint8_t>(cells >> (kZoneCells - 1 - count) & 1U);
     return 0;
 }

@@ -1,13 +1,11 @@
 // Requirement: is the least mean grey difference of all small shifts below the tolerance, is it
 // not, or has no shift enough common finger area?
 //
-// Observation: the least difference itself is not needed. Rest is known with the first shift below
-// the tolerance; and a sum of differences only grows, so a shift is not below as soon as its sum
-// reaches tolerance * area.
+// Observation: the least difference is not needed. Rest is known with the first shift below the
+// tolerance; a sum only grows, so a shift is not below once its sum reaches tolerance * area.
 //
 // Algorithm: shift 0 first, since a resting finger mostly matches there. The sum is compared with
-// tolerance * an upper bound of the area; the area is counted only for shifts whose sum stays
-// below.
+// tolerance * an upper bound of the area; the area is counted only where the sum stays below.
 #include "motion/FingerNoMove.h"
 
 #include <algorithm>
@@ -47,31 +45,29 @@ Meeting StayIn(std::initializer_list<Span> bands, int32_t shift) {
     return meeting;
 }
 
-// The columns compared at one shift: those of the centre, and all. Deliberate: a pixel of two
-// borders that overlap counts twice, so the columns of the last one are then kept apart.
+// The columns compared at one shift. Deliberate: a pixel of two borders that overlap counts twice,
+// so the columns of the last one are then kept apart.
 struct ShiftedColumns {
     Columns centre;
     Columns all;
     Columns apart;
-
-    ShiftedColumns(const Bands& bands, int32_t dc)
-        : centre(CutColumns(StayIn({bands.centre}, dc))),
-          all(CutColumns(bands.Overlap() ? StayIn({bands.first}, dc)
-                                         : StayIn({bands.first, bands.centre, bands.last}, dc))),
-          apart(CutColumns(bands.Overlap() ? StayIn({bands.last}, dc) : StayIn({}, dc))) {}
 };
 
-// What is compared at one shift.
-using Regions = Pairing[3];
+ShiftedColumns ShiftColumns(const Bands& bands, int32_t dc) {
+    const Columns centre = CutColumns(StayIn({bands.centre}, dc));
+    if (bands.Overlap())
+        return {centre, CutColumns(StayIn({bands.first}, dc)),
+                CutColumns(StayIn({bands.last}, dc))};
+    return {centre, CutColumns(StayIn({bands.first, bands.centre, bands.last}, dc)), {}};
+}
 
 // The test of one pair of frames.
 class ShiftTest {
   public:
     explicit ShiftTest(const FramePair& pair)
-        : m_prev(pair.prev),
-          m_curr(pair.curr),
-          m_rows(CutBands(m_prev.height, s_boundHeight)),
-          m_columns(CutBands(m_prev.width, s_boundWidth)) {}
+        : m_pair(pair),
+          m_rows(CutBands(pair.prev.height, s_boundHeight)),
+          m_columns(CutBands(pair.prev.width, s_boundWidth)) {}
 
     // Some shift tested so far has enough common finger area.
     bool Counted() const { return m_counted; }
@@ -82,12 +78,12 @@ class ShiftTest {
         if (s_smallMoveTolRow < 0 || s_smallMoveTolCol < 0)  // there is no shift to test
             return false;
         // Beyond the frame's sides no pixel meets another.
-        const int32_t drMax = std::min(s_smallMoveTolRow, m_prev.height);
-        const int32_t dcMax = std::min(s_smallMoveTolCol, m_prev.width);
-        if (Test(0, ShiftedColumns(m_columns, 0)))
+        const int32_t drMax = std::min(s_smallMoveTolRow, m_pair.prev.height);
+        const int32_t dcMax = std::min(s_smallMoveTolCol, m_pair.prev.width);
+        if (Test(0, ShiftColumns(m_columns, 0)))
             return true;
         for (int32_t dc = -dcMax; dc <= dcMax; ++dc) {
-            const ShiftedColumns columns(m_columns, dc);
+            const ShiftedColumns columns = ShiftColumns(m_columns, dc);
             for (int32_t dr = -drMax; dr <= drMax; ++dr) {
                 if ((dr != 0 || dc != 0) && Test(dr, columns))
                     return true;
@@ -102,46 +98,38 @@ class ShiftTest {
     bool Test(int32_t dr, const ShiftedColumns& columns) {
         const Meeting centre = StayIn({m_rows.centre}, dr);
         const Meeting borders = StayIn({m_rows.first, m_rows.last}, dr);
-        return IsBelowTolerance(
-            {{&centre, &columns.all}, {&centre, &columns.apart}, {&borders, &columns.centre}});
-    }
-
-    // An upper bound of the common area: the pixels of the regions, or the smaller finger area of
-    // the frames, twice that where bands overlap.
-    int64_t MostArea(const Regions& regions) const {
+        const Pairing regions[] = {
+            {&centre, &columns.all}, {&centre, &columns.apart}, {&borders, &columns.centre}};
+        // The common area is at most the pixels of the regions, and the smaller finger area of the
+        // frames, twice that where bands overlap.
         int64_t pixels = 0;
         for (const Pairing& region : regions)
             pixels += int64_t{region.rows->places} * region.columns->meeting.places;
         const int64_t times = m_rows.Overlap() || m_columns.Overlap() ? 2 : 1;
-        return std::min(pixels, times * std::min(m_prev.area, m_curr.area));
-    }
-
-    // mean < tolerance implies sum < tolerance * area <= tolerance * MostArea, so a sum that
-    // reaches the latter is not below. A sum that may exceed 2^31 - 1 is taken in full, because its
-    // mean is that of the wrapped sum.
-    bool IsBelowTolerance(const Regions& regions) {
-        const int64_t most = MostArea(regions);
+        const int64_t most = std::min(pixels, times * std::min(m_pair.prev.area, m_pair.curr.area));
+        // mean < tolerance implies sum < tolerance * area <= tolerance * most, so a sum that
+        // reaches the latter is not below. A sum that may exceed 2^31 - 1 is taken in full, because
+        // its mean is that of the wrapped sum.
         const bool mayWrap = most * kGreyMax > std::numeric_limits<int32_t>::max();
         const int64_t limit =
             mayWrap ? std::numeric_limits<int64_t>::max() : s_diffThresholdTol * most;
         int64_t sum = 0;
         for (const Pairing& region : regions) {
             if (sum < limit)
-                sum += DifferenceSum(m_prev, m_curr, region, limit - sum);
+                sum += DifferenceSum(m_pair.prev, m_pair.curr, region, limit - sum);
         }
         if (sum >= limit && m_counted)
             return false;
         int32_t area = 0;
         for (const Pairing& region : regions)
-            area += CommonArea(m_prev, m_curr, region);
+            area += CommonArea(m_pair.prev, m_pair.curr, region);
         if (area < 1 || area < s_overlapAreaMinNoMove)
             return false;
         m_counted = true;
         return sum < limit && Wrap(sum) / area < s_diffThresholdTol;
     }
 
-    const LaidFrame& m_prev;
-    const LaidFrame& m_curr;
+    const FramePair& m_pair;
     const Bands m_rows;
     const Bands m_columns;
     bool m_counted = false;
