@@ -9,7 +9,6 @@
 #include "FingerDetect.h"
 #include "FpNavi.h"
 #include "Reference.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
 #include "gesture/Gesture.h"

@@ -7,7 +7,6 @@
 #include "StepFrames.h"
 #include "StepSizes.h"
 #include "StepTestPair.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
 #include "motion/CenterMove.h"

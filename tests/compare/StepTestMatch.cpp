@@ -9,7 +9,6 @@
 #include "StepFrames.h"
 #include "StepTestPair.h"
 #include "frame/FramePair.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "matching/DisplacementScore.h"
 #include "param/NaviParam.h"

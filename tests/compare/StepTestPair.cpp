@@ -5,7 +5,6 @@
 #include <cstring>
 
 #include "Twin.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "frame/PreProcess.h"
 #include "matching/CandidateSearch.h"

@@ -11,7 +11,7 @@ from tree import PLAIN, Failure, run
 
 # Files of the module whose tests are in the test file of another.
 _TESTED_IN = {
-    'BiThreshold': 'PreProcess', 'FingerRidge': 'PreProcess', 'StretchRange': 'PreProcess',
+    'BiThreshold': 'PreProcess', 'FingerRidge': 'PreProcess',
     'FramePair': 'FingerNoMove', 'Templates': 'FindCandidate',
     'PlacementScores': 'FindCandidate', 'CandidateSearch': 'FindCandidate',
     'DisplacementScore': 'ImgJoint', 'PairMatch': 'ImgJoint', 'TuneMeasure': 'Tune',
@@ -20,7 +20,7 @@ _TESTED_IN = {
 }
 # Files that the step tests do not call.
 _NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneMeasure',
-             'TuneRegisters', 'NaviBlock', 'alog_host'}
+             'TuneRegisters', 'alog_host'}
 _COMPARED = {'FPNAVI_COMPARE_GESTURES': '200', 'FPNAVI_HOSTILE_BLOCKS': '60'}
 _MEMORY = 1 << 30  # bytes a test may take; the largest takes a tenth
 _OUTPUT = 1 << 24  # bytes it may print

@@ -205,9 +205,15 @@ TEST(Pairing, RowsThatMeetNothingHaveNoAreaAndNoSum) {
     EXPECT_EQ(DifferenceSum(laid, laid, {&none, &columns}, 1), 0);
 }
 
-TEST(CutColumns, ColumnsThatMeetNothingAreEmpty) {
-    EXPECT_TRUE(CutColumns({0, 0, 0, {}}).Empty());
-    EXPECT_FALSE(CutColumns({0, 1, 1, {{7, 8}}}).Empty());
+TEST(Pairing, ColumnsThatMeetNothingHaveNoAreaAndNoSum) {
+    TestFrame black(20, 5, 0, 1);
+    TestFrame white(20, 5, 255, 1);
+    const LaidFrame laid1 = LayOut(*black.Get());
+    const LaidFrame laid2 = LayOut(*white.Get());
+    const Meeting rows = {0, 5, 1, {{0, 5}}};
+    const Columns none = CutColumns({0, 0, 0, {}});
+    EXPECT_EQ(CommonArea(laid1, laid2, {&rows, &none}), 0);
+    EXPECT_EQ(DifferenceSum(laid1, laid2, {&rows, &none}, 1), 0);
 }
 
 // A limit of none is reached before anything is read.

@@ -2,7 +2,6 @@
 #include <gtest/gtest.h>
 
 #include "Fixtures.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 
 namespace {

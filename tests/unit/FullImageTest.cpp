@@ -7,7 +7,6 @@
 
 #include "FailingMalloc.h"
 #include "Fixtures.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 
 namespace {

@@ -6,7 +6,6 @@
 
 #include "FailingMalloc.h"
 #include "Fixtures.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "matching/PairMatch.h"
 #include "param/NaviParam.h"

@@ -1,6 +1,5 @@
-// Two frames laid out for comparison, and the comparison itself: the grey differences of the pixels
-// that are finger in both, at any displacement. Owns nothing; the mask of a frame lies in the space
-// behind its classes.
+// Two frames laid out for comparison, and the grey differences of the pixels that are finger in
+// both, at any displacement. Owns nothing; a frame's mask lies in the space behind its classes.
 #ifndef FPNAVI_FRAMEPAIR_H
 #define FPNAVI_FRAMEPAIR_H
 
@@ -26,8 +25,7 @@ struct LaidFrame {
 // into the buffers of img and is valid until one of them changes.
 LaidFrame LayOut(const NaviFrame_t& img);
 
-// The working state of a frame pair: a value that the driver of the pair makes and passes to all
-// steps.
+// The working state of a frame pair: the driver of the pair makes it and passes it to all steps.
 struct FramePair {
     LaidFrame prev;
     LaidFrame curr;
@@ -58,8 +56,8 @@ inline Span Meet(const Span& span, const Span& other, int32_t offset) {
 
 inline constexpr int32_t kBandMax = 3;  // border, centre, border
 
-// Places p of one axis that meet p + offset of the other frame: count spans in ascending order,
-// none empty, none overlapping another.
+// Places p of one axis that meet p + offset of the other frame: count spans, none empty. Those of
+// columns are in ascending order, and none overlaps another.
 struct Meeting {
     int32_t offset;
     int32_t places;  // in all spans
@@ -82,30 +80,26 @@ struct ColumnPiece {
     Bytes16 mask[4];
 };
 
-// Columns that meet, and the first piece of them: with at most 64 columns there is no other. head
-// is undefined when none meets.
+// Columns that meet, and the first piece of them, empty when none meets.
 struct Columns {
     Meeting meeting;
     ColumnPiece head;
-
-    bool Empty() const { return meeting.count == 0; }
 };
 
 Columns CutColumns(const Meeting& meeting);
 
 // Pixel (r, c) of the first frame meets (r + offset of rows, c + offset of columns) of the second,
-// for each place r of rows and c of columns. All of these lie inside both frames; columns are not
-// empty.
+// which has the same size, for each place r of rows and c of columns. All of these lie inside both.
 struct Pairing {
     const Meeting* rows;
     const Columns* columns;
 };
 
-// Pixels of the pairing that are finger in both frames: at most 2^24.
+// Pixels of the pairing that are finger in both frames, those of two spans twice: at most 2^25.
 int32_t CommonArea(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing);
 
-// Sum of the grey differences over the pairing's common area, at most 255 * 2^24. Once the sum
-// reaches limit it may stop and return what it has, at least limit.
+// Sum of the grey differences over the pairing's common area. Once the sum reaches limit it may
+// stop and return what it has, at least limit.
 int64_t DifferenceSum(const LaidFrame& first, const LaidFrame& second, const Pairing& pairing,
                       int64_t limit);
 

@@ -18,6 +18,9 @@ int32_t ImgPreProcess(NaviFrame_t* img);
 // Returns 0, or -1 for a null pointer or an empty frame.
 int32_t CalcBiThr(const NaviFrame_t* img, int32_t* thr, int32_t* scale);
 
+// CalcBiThr of size pixels. hist [in]: their greys, counted.
+void SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size, int32_t* thr, int32_t* scale);
+
 // Builds the finger area in pType: the pixels of grey <= thr and all between two of them in a row
 // or a column, twice over. img has pixels, and room behind them (FrameBytes).
 void GetFingerRidge(NaviFrame_t* img, int32_t thr);
@@ -25,22 +28,6 @@ void GetFingerRidge(NaviFrame_t* img, int32_t thr);
 // Stretches the greys of the finger area so that its s_cutOffPercent percentile becomes 0 and the
 // opposite one scale. Returns 0, or -1 for a frame without pixels.
 int32_t StretchRange(NaviFrame_t* img, uint8_t scale);
-
-// The two classes that a threshold makes.
-struct BiThreshold {
-    int32_t thr;    // as CalcBiThr gives it
-    int32_t scale;  // likewise
-};
-
-// CalcBiThr of size pixels. hist [in]: their greys, counted.
-BiThreshold SplitGreys(const int32_t (&hist)[kGreyLevels], int32_t size);
-
-// StretchRange of a frame with pixels.
-//   img [in, out]   greys of the finger area are stretched
-//   scale           grey level of the upper percentile
-//   cutOff          the percentile, percent of the finger's pixels
-//   hist [in, out]  all greys of img, counted; those of the finger area afterwards
-void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t cutOff, int32_t (&hist)[kGreyLevels]);
 
 }  // namespace fpnavi
 

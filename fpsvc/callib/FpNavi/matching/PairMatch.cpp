@@ -13,7 +13,6 @@
 #include <cstdlib>
 
 #include "base/NaviMath.h"
-#include "frame/FullImage.h"
 #include "frame/NaviFrame.h"
 #include "gesture/Gesture.h"
 #include "matching/CandidateSearch.h"

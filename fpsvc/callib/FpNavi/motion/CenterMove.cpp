@@ -18,60 +18,6 @@
 namespace fpnavi {
 namespace {
 
-// The axis of a carries the displacement: a is at least the threshold and at least 1.2 times b.
-// Both are lengths, not negative.
-bool Dominates(int32_t a, int32_t b) {
-    return a >= s_singleMoveThreshold && 100 * a >= 120 * b;
-}
-
-// The coverage changes much for the displacement way: the finger is pressed or lifted, it does not
-// slide.
-bool IsDeformation(int32_t dcvr, int32_t way) {
-    if (!IsHg() || way == 0)
-        return false;
-    const int32_t deform_rate = dcvr / way;
-    return WrapAbs(deform_rate) > s_deformThreshold;
-}
-
-// The finger's pixels, and the sums of their columns and rows. A frame of 4096 x 4096 pixels has
-// 2^24 of them, and sums below 2^36.
-struct FingerSums {
-    int64_t count;
-    int64_t column;
-    int64_t row;
-};
-
-// The sums of sixteen columns from first on, of which the frame has the first count; 1 <= count <=
-// 16. All three fit 32 bits: at most 16 * 4096 = 2^16 pixels, column sums below 2^16 * 15, row sums
-// below 2^16 * 2^12 / 2 = 2^27.
-FingerSums SumStrip(const NaviFrame_t& img, int32_t first, int32_t count) {
-    const Bytes16 one = Splat16(1);
-    const Bytes16 ones = And16(FirstBytes(count), one);
-    const Bytes16 columns = And16(FirstBytes(count), LaneNumbers());
-    Sums pixels = NoSums();
-    Sums columnSums = NoSums();
-    Sums rowSums = NoSums();
-    for (int32_t row = img.height - 1; row >= 0; --row) {
-        rowSums = AddSums(rowSums, pixels);
-        const Bytes16 finger = Equal16(Load16(img.pType + row * img.width + first), one);
-        pixels = AddBytes(pixels, And16(finger, ones));
-        columnSums = AddBytes(columnSums, And16(finger, columns));
-    }
-    const int64_t all = Total(pixels);
-    return {all, Total(columnSums) + first * all, Total(rowSums)};
-}
-
-FingerSums SumFinger(const NaviFrame_t& img) {
-    FingerSums sums = {0, 0, 0};
-    for (int32_t first = 0; first < img.width; first += kLanes) {
-        const FingerSums strip = SumStrip(img, first, std::min(img.width - first, kLanes));
-        sums.count += strip.count;
-        sums.column += strip.column;
-        sums.row += strip.row;
-    }
-    return sums;
-}
-
 // Mean of the pixels' centres, 100 * place + 50 in hundredths of a pixel, by the side: percent of
 // the side.
 int64_t Centre(int64_t placeSum, int64_t count, int32_t side) {
@@ -83,12 +29,34 @@ int64_t Centre(int64_t placeSum, int64_t count, int32_t side) {
 int32_t GetCenterAndCoverage(NaviFrame_t* img) {
     if (!HasPixels(img))
         return -1;
-    const FingerSums sums = SumFinger(*img);
-    const int64_t size = int64_t{img->width} * img->height;
-    const bool any = sums.count != 0;
-    img->xc = any ? static_cast<int32_t>(Centre(sums.column, sums.count, img->width) - 50) : 0;
-    img->yc = any ? static_cast<int32_t>(50 - Centre(sums.row, sums.count, img->height)) : 0;
-    img->cvr = static_cast<int32_t>(100 * sums.count / size);
+    const Bytes16 one = Splat16(1);
+    // At most 2^24 pixels, and sums below 2^36. Those of a strip fit 32 bits: at most 16 * 4096 =
+    // 2^16 pixels, column sums below 2^16 * 15, row sums below 2^16 * 2^12 / 2 = 2^27.
+    int64_t count = 0;
+    int64_t columnSum = 0;
+    int64_t rowSum = 0;
+    for (int32_t first = 0; first < img->width; first += kLanes) {
+        const Bytes16 inside = FirstBytes(std::min(img->width - first, kLanes));
+        const Bytes16 ones = And16(inside, one);
+        const Bytes16 columns = And16(inside, LaneNumbers());
+        Sums pixels = NoSums();
+        Sums columnSums = NoSums();
+        Sums rowSums = NoSums();
+        for (int32_t row = img->height - 1; row >= 0; --row) {
+            rowSums = AddSums(rowSums, pixels);
+            const Bytes16 finger = Equal16(Load16(img->pType + row * img->width + first), one);
+            pixels = AddBytes(pixels, And16(finger, ones));
+            columnSums = AddBytes(columnSums, And16(finger, columns));
+        }
+        const int64_t inStrip = Total(pixels);
+        count += inStrip;
+        columnSum += Total(columnSums) + first * inStrip;
+        rowSum += Total(rowSums);
+    }
+    const bool any = count != 0;
+    img->xc = any ? static_cast<int32_t>(Centre(columnSum, count, img->width) - 50) : 0;
+    img->yc = any ? static_cast<int32_t>(50 - Centre(rowSum, count, img->height)) : 0;
+    img->cvr = static_cast<int32_t>(100 * count / (img->width * img->height));
     return 0;
 }
 
@@ -113,18 +81,17 @@ int32_t CalcCenterMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr,
         *verdict = visible ? VKEY_NO_MOVE : VKEY_NONE;
         return 0;
     }
-    int32_t way = 0;
-    if (Dominates(ax, ay)) {
-        *verdict = dx <= 0 ? VKEY_LEFT : VKEY_RIGHT;
-        way = dx;
-    } else if (Dominates(ay, ax)) {
-        *verdict = dy <= 0 ? VKEY_DOWN : VKEY_UP;
-        way = dy;
-    } else {
+    // The axis that carries the displacement has at least 1.2 times that of the other.
+    const bool alongX = 100 * ax >= 120 * ay;
+    if (!alongX && 100 * ay < 120 * ax) {
         *verdict = VKEY_NONE;  // diagonal
         return 0;
     }
-    if (IsDeformation(img_curr->cvr - img_prev->cvr, way)) {
+    *verdict = alongX ? (dx <= 0 ? VKEY_LEFT : VKEY_RIGHT) : (dy <= 0 ? VKEY_DOWN : VKEY_UP);
+    // Coverage that changes much for the way: the finger is pressed or lifted, it does not slide.
+    const int32_t way = alongX ? dx : dy;
+    const int32_t dcvr = img_curr->cvr - img_prev->cvr;
+    if (IsHg() && way != 0 && WrapAbs(dcvr / way) > s_deformThreshold) {
         *verdict = VKEY_NO_MOVE;
         voteInfo->dx_ct[calc_cnt] = 0;
         voteInfo->dy_ct[calc_cnt] = 0;

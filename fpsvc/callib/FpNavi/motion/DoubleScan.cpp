@@ -13,47 +13,34 @@ int32_t DoubleScanGetCenterAndCoverage(const uint8_t* DoubleScanZone, int32_t* x
                                        int32_t* cvr) {
     if (DoubleScanZone == nullptr || xc == nullptr || yc == nullptr || cvr == nullptr)
         return -1;
-    const int32_t width = 8;
-    const int32_t height = 8;
-    const int32_t size = width * height;
+    constexpr int32_t kSide = 8;
     int32_t cnt = 0;
     int32_t x = 0;  // sums of cell centres in hundredths of a cell
     int32_t y = 0;
-    for (int32_t cur = 0; cur < size; ++cur) {
+    for (int32_t cur = 0; cur < kZoneCells; ++cur) {
         if (DoubleScanZone[cur] != 1)
             continue;
         ++cnt;
-        x += 100 * (cur % width) + 50;
-        y += 100 * (cur / width) + 50;
+        x += 100 * (cur % kSide) + 50;
+        y += 100 * (cur / kSide) + 50;
     }
-    *xc = cnt == 0 ? 0 : x / (width * cnt) - 50;
-    *yc = cnt == 0 ? 0 : 50 - y / (height * cnt);
-    *cvr = 100 * cnt / size;
+    *xc = cnt == 0 ? 0 : x / (kSide * cnt) - 50;
+    *yc = cnt == 0 ? 0 : 50 - y / (kSide * cnt);
+    *cvr = 100 * cnt / kZoneCells;
     return 0;
 }
 
 int32_t CalcDoubleScanMove(const uint8_t* pPrev, const uint8_t* pCurr, NaviVoteInfo_t* voteInfo) {
-    int32_t xc_prev = 0;
-    int32_t yc_prev = 0;
-    int32_t cvr_prev = 0;
-    int32_t xc_cvrr = 0;
-    int32_t yc_cvrr = 0;
-    int32_t cvr_cvrr = 0;
-    if (DoubleScanGetCenterAndCoverage(pPrev, &xc_prev, &yc_prev, &cvr_prev) != 0)
-        return -1;
-    if (DoubleScanGetCenterAndCoverage(pCurr, &xc_cvrr, &yc_cvrr, &cvr_cvrr) != 0)
-        return -1;
     const int32_t calc_cnt = PairCount(*voteInfo);
-    if (calc_cnt == kPairCountMax)
+    if (pPrev == nullptr || pCurr == nullptr || calc_cnt == kPairCountMax)
         return -1;
-    voteInfo->xc_ds[calc_cnt] = xc_prev;
-    voteInfo->yc_ds[calc_cnt] = yc_prev;
-    voteInfo->cvr_ds[calc_cnt] = cvr_prev;
-    voteInfo->xc_ds[calc_cnt + 1] = xc_cvrr;
-    voteInfo->yc_ds[calc_cnt + 1] = yc_cvrr;
-    voteInfo->cvr_ds[calc_cnt + 1] = cvr_cvrr;
-    voteInfo->dx_ds[calc_cnt] = xc_cvrr - xc_prev;
-    voteInfo->dy_ds[calc_cnt] = yc_cvrr - yc_prev;
+    int32_t* const xc = voteInfo->xc_ds + calc_cnt;
+    int32_t* const yc = voteInfo->yc_ds + calc_cnt;
+    int32_t* const cvr = voteInfo->cvr_ds + calc_cnt;
+    DoubleScanGetCenterAndCoverage(pPrev, xc, yc, cvr);
+    DoubleScanGetCenterAndCoverage(pCurr, xc + 1, yc + 1, cvr + 1);
+    voteInfo->dx_ds[calc_cnt] = xc[1] - xc[0];
+    voteInfo->dy_ds[calc_cnt] = yc[1] - yc[0];
     return 0;
 }
 
@@ -62,10 +49,8 @@ int32_t CalcDoubleScanMove(const uint8_t* pPrev, const uint8_t* pCurr, NaviVoteI
 int32_t GetDoubleScanNaviBlock(uint32_t gReg24, uint32_t gReg28) {
     using namespace fpnavi;
     std::memcpy(DoubleScanZonePrev, DoubleScanZoneCurr, sizeof DoubleScanZonePrev);
-    // Bit 31 of gReg28 is cell 0, bit 31 of gReg24 cell 32.
-    for (int32_t count = 0; count < kZoneCells; ++count) {
-        const uint32_t reg = count < 32 ? gReg28 : gReg24;
-        DoubleScanZoneCurr[count] = static_cast<uint8_t>((reg >> (31 - count % 32)) & 1U);
-    }
+    const uint64_t cells = uint64_t{gReg28} << 32 | gReg24;  // the top bit is cell 0
+    for (int32_t count = 0; count < kZoneCells; ++count)
+        DoubleScanZoneCurr[count] = static_cast<uint8_t>(cells >> (kZoneCells - 1 - count) & 1U);
     return 0;
 }

@@ -22,7 +22,7 @@ int32_t DoubleScanGetCenterAndCoverage(const uint8_t* DoubleScanZone, int32_t* x
 
 // Writes the double-scan entries of voteInfo [in, out] at calc_cnt (frame entries also at calc_cnt
 // + 1) for the maps pPrev and pCurr [in], kZoneCells bytes each. Returns 0, or -1 with nothing
-// written when a map cannot be measured or all pairs are counted.
+// written when a map is null or all pairs are counted.
 int32_t CalcDoubleScanMove(const uint8_t* pPrev, const uint8_t* pCurr, NaviVoteInfo_t* voteInfo);
 
 }  // namespace fpnavi

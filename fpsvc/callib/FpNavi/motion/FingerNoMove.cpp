@@ -1,16 +1,15 @@
 // Requirement: is the least mean grey difference of all small shifts below the tolerance, is it
 // not, or has no shift enough common finger area?
 //
-// Observation: the least difference itself is not needed. Rest is known with the first shift below
-// the tolerance; and a sum of differences only grows, so a shift is not below as soon as its sum
-// reaches tolerance * area.
+// Observation: the least difference is not needed. Rest is known with the first shift below the
+// tolerance; a sum only grows, so a shift is not below once its sum reaches tolerance * area.
 //
 // Algorithm: shift 0 first, since a resting finger mostly matches there. The sum is compared with
-// tolerance * an upper bound of the area; the area is counted only for shifts whose sum stays
-// below.
+// tolerance * an upper bound of the area; the area is counted only where the sum stays below.
 #include "motion/FingerNoMove.h"
 
 #include <algorithm>
+#include <initializer_list>
 #include <limits>
 
 #include "base/NaviMath.h"
@@ -20,7 +19,6 @@ namespace fpnavi {
 namespace {
 
 constexpr int32_t kMeanNone = 256;  // least mean when no shift counts: above every mean
-constexpr int32_t kRegionMax = 4;   // pairings of one shift
 
 // One axis of the frame: border, centre, border. Borders of more than half the side overlap and
 // leave no centre. A border that is negative or longer than the side leaves all three empty.
@@ -34,79 +32,42 @@ struct Bands {
 
 Bands CutBands(int32_t side, int32_t bound) {
     if (bound < 0 || bound > side)
-        return {{0, 0}, {0, 0}, {0, 0}};
+        return {};
     return {{0, bound}, {bound, side - bound}, {side - bound, side}};
 }
 
-// Places of the bands a, b and c that lie in the same band after the shift: place p of the previous
-// frame meets p - shift of the current one.
-Meeting StayIn(int32_t shift, const Span& a = {0, 0}, const Span& b = {0, 0},
-               const Span& c = {0, 0}) {
+// Places of bands that lie in the same band after the shift: place p of the previous frame meets
+// p - shift of the current one.
+Meeting StayIn(std::initializer_list<Span> bands, int32_t shift) {
     Meeting meeting = {-shift, 0, 0, {}};
-    for (const Span& band : {a, b, c})
+    for (const Span& band : bands)
         meeting.Add(Meet(band, band, -shift));
     return meeting;
 }
 
-// What is compared at one shift: five regions, the centre and four border bands without the
-// corners. Rows of the centre are compared in all columns, rows of the borders in the columns of
-// the centre. Deliberate: bands that overlap are kept apart, so that a pixel of both counts twice.
-struct ShiftedRows {
-    Meeting centre;
-    Meeting borders[2];
-};
-
+// The columns compared at one shift. Deliberate: a pixel of two borders that overlap counts twice,
+// so the columns of the last one are then kept apart.
 struct ShiftedColumns {
     Columns centre;
-    Columns all[2];
+    Columns all;
+    Columns apart;
 };
-
-ShiftedRows ShiftRows(const Bands& bands, int32_t dr) {
-    if (bands.Overlap())
-        return {StayIn(dr, bands.centre), {StayIn(dr, bands.first), StayIn(dr, bands.last)}};
-    return {StayIn(dr, bands.centre), {StayIn(dr, bands.first, bands.last), StayIn(dr)}};
-}
 
 ShiftedColumns ShiftColumns(const Bands& bands, int32_t dc) {
-    const Columns centre = CutColumns(StayIn(dc, bands.centre));
+    const Columns centre = CutColumns(StayIn({bands.centre}, dc));
     if (bands.Overlap())
-        return {centre, {CutColumns(StayIn(dc, bands.first)), CutColumns(StayIn(dc, bands.last))}};
-    return {
-        centre,
-        {CutColumns(StayIn(dc, bands.first, bands.centre, bands.last)), CutColumns(StayIn(dc))}};
+        return {centre, CutColumns(StayIn({bands.first}, dc)),
+                CutColumns(StayIn({bands.last}, dc))};
+    return {centre, CutColumns(StayIn({bands.first, bands.centre, bands.last}, dc)), {}};
 }
-
-struct Regions {
-    int32_t count;
-    Pairing pairings[kRegionMax];
-
-    void Add(const Meeting& rows, const Columns& columns) {
-        if (rows.count > 0 && !columns.Empty())
-            pairings[count++] = {&rows, &columns};
-    }
-};
-
-Regions PairRegions(const ShiftedRows& rows, const ShiftedColumns& columns) {
-    Regions regions;
-    regions.count = 0;
-    regions.Add(rows.centre, columns.all[0]);
-    regions.Add(rows.centre, columns.all[1]);
-    regions.Add(rows.borders[0], columns.centre);
-    regions.Add(rows.borders[1], columns.centre);
-    return regions;
-}
-
-constexpr int32_t kAreaUnknown = -1;
 
 // The test of one pair of frames.
 class ShiftTest {
   public:
-    ShiftTest(const LaidFrame& prev, const LaidFrame& curr, const NoMoveLimits& limits)
-        : m_prev(prev),
-          m_curr(curr),
-          m_limits(limits),
-          m_rows(CutBands(prev.height, limits.boundHeight)),
-          m_columns(CutBands(prev.width, limits.boundWidth)) {}
+    explicit ShiftTest(const FramePair& pair)
+        : m_pair(pair),
+          m_rows(CutBands(pair.prev.height, s_boundHeight)),
+          m_columns(CutBands(pair.prev.width, s_boundWidth)) {}
 
     // Some shift tested so far has enough common finger area.
     bool Counted() const { return m_counted; }
@@ -114,11 +75,11 @@ class ShiftTest {
     // Tests the shifts within the limits, shift 0 first, until one is below the tolerance. Returns
     // whether one is.
     bool TestShifts() {
-        if (m_limits.tolRow < 0 || m_limits.tolCol < 0)  // there is no shift to test
+        if (s_smallMoveTolRow < 0 || s_smallMoveTolCol < 0)  // there is no shift to test
             return false;
         // Beyond the frame's sides no pixel meets another.
-        const int32_t drMax = std::min(m_limits.tolRow, m_prev.height);
-        const int32_t dcMax = std::min(m_limits.tolCol, m_prev.width);
+        const int32_t drMax = std::min(s_smallMoveTolRow, m_pair.prev.height);
+        const int32_t dcMax = std::min(s_smallMoveTolCol, m_pair.prev.width);
         if (Test(0, ShiftColumns(m_columns, 0)))
             return true;
         for (int32_t dc = -dcMax; dc <= dcMax; ++dc) {
@@ -132,79 +93,53 @@ class ShiftTest {
     }
 
   private:
+    // Rows of the centre are compared in all columns, rows of the borders, which may overlap too,
+    // in the columns of the centre. Corners are not compared.
     bool Test(int32_t dr, const ShiftedColumns& columns) {
-        const ShiftedRows rows = ShiftRows(m_rows, dr);
-        const Regions regions = PairRegions(rows, columns);
-        const int32_t area = m_counted ? kAreaUnknown : Area(regions);
-        m_counted = m_counted || AreaCounts(area);
-        return IsBelowTolerance(regions, area);
-    }
-
-    bool AreaCounts(int32_t area) const { return area >= 1 && area >= m_limits.overlapAreaMin; }
-
-    int32_t Area(const Regions& regions) const {
-        int32_t area = 0;
-        for (int32_t i = 0; i < regions.count; ++i)
-            area += CommonArea(m_prev, m_curr, regions.pairings[i]);
-        return area;
-    }
-
-    // An upper bound of Area: the pixels of the regions, or the smaller finger area of the frames,
-    // twice that where bands overlap.
-    int64_t MostArea(const Regions& regions) const {
+        const Meeting centre = StayIn({m_rows.centre}, dr);
+        const Meeting borders = StayIn({m_rows.first, m_rows.last}, dr);
+        const Pairing regions[] = {
+            {&centre, &columns.all}, {&centre, &columns.apart}, {&borders, &columns.centre}};
+        // The common area is at most the pixels of the regions, and the smaller finger area of the
+        // frames, twice that where bands overlap.
         int64_t pixels = 0;
-        for (int32_t i = 0; i < regions.count; ++i)
-            pixels += int64_t{regions.pairings[i].rows->places} *
-                      regions.pairings[i].columns->meeting.places;
+        for (const Pairing& region : regions)
+            pixels += int64_t{region.rows->places} * region.columns->meeting.places;
         const int64_t times = m_rows.Overlap() || m_columns.Overlap() ? 2 : 1;
-        return std::min(pixels, times * std::min(m_prev.area, m_curr.area));
-    }
-
-    int64_t Sum(const Regions& regions, int64_t limit) const {
+        const int64_t most = std::min(pixels, times * std::min(m_pair.prev.area, m_pair.curr.area));
+        // mean < tolerance implies sum < tolerance * area <= tolerance * most, so a sum that
+        // reaches the latter is not below. A sum that may exceed 2^31 - 1 is taken in full, because
+        // its mean is that of the wrapped sum.
+        const bool mayWrap = most * kGreyMax > std::numeric_limits<int32_t>::max();
+        const int64_t limit =
+            mayWrap ? std::numeric_limits<int64_t>::max() : s_diffThresholdTol * most;
         int64_t sum = 0;
-        for (int32_t i = 0; i < regions.count && sum < limit; ++i)
-            sum += DifferenceSum(m_prev, m_curr, regions.pairings[i], limit - sum);
-        return sum;
+        for (const Pairing& region : regions) {
+            if (sum < limit)
+                sum += DifferenceSum(m_pair.prev, m_pair.curr, region, limit - sum);
+        }
+        if (sum >= limit && m_counted)
+            return false;
+        int32_t area = 0;
+        for (const Pairing& region : regions)
+            area += CommonArea(m_pair.prev, m_pair.curr, region);
+        if (area < 1 || area < s_overlapAreaMinNoMove)
+            return false;
+        m_counted = true;
+        return sum < limit && Wrap(sum) / area < s_diffThresholdTol;
     }
 
-    bool IsBelowTolerance(const Regions& regions, int32_t area) const;
-
-    const LaidFrame& m_prev;
-    const LaidFrame& m_curr;
-    const NoMoveLimits& m_limits;
+    const FramePair& m_pair;
     const Bands m_rows;
     const Bands m_columns;
     bool m_counted = false;
 };
 
-// mean < tolerance implies sum < tolerance * area <= tolerance * MostArea, so a sum that reaches
-// the latter is not below. A sum that may exceed 2^31 - 1 is taken in full, because its mean is
-// that of the wrapped sum. area: Area(regions), or kAreaUnknown.
-bool ShiftTest::IsBelowTolerance(const Regions& regions, int32_t area) const {
-    const int64_t most = MostArea(regions);
-    const bool mayWrap = most * kGreyMax > std::numeric_limits<int32_t>::max();
-    const int64_t limit =
-        mayWrap ? std::numeric_limits<int64_t>::max() : int64_t{m_limits.diffTol} * most;
-    const int64_t sum = Sum(regions, limit);
-    if (sum >= limit)
-        return false;
-    if (area == kAreaUnknown)
-        area = Area(regions);
-    return AreaCounts(area) && Wrap(sum) / area < m_limits.diffTol;
-}
-
 }  // namespace
 
-NoMoveLimits CurrentNoMoveLimits() {
-    return {s_boundWidth,      s_boundHeight,          s_smallMoveTolRow,
-            s_smallMoveTolCol, s_overlapAreaMinNoMove, s_diffThresholdTol};
-}
-
-int32_t TestNoMove(const LaidFrame& prev, const LaidFrame& curr, const NoMoveLimits& limits) {
-    ShiftTest test(prev, curr, limits);
-    if (test.TestShifts())
-        return kNoMoveResting;
-    if (!test.Counted() && kMeanNone < limits.diffTol)
+int32_t TestNoMove(const FramePair& pair) {
+    ShiftTest test(pair);
+    if (test.TestShifts() || (!test.Counted() && kMeanNone < s_diffThresholdTol))
         return kNoMoveResting;
     return test.Counted() ? kNoMoveMoved : kNoMoveUndetermined;
 }
@@ -212,7 +147,7 @@ int32_t TestNoMove(const LaidFrame& prev, const LaidFrame& curr, const NoMoveLim
 int32_t FingerNoMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
     if (!AreComparable(img_prev, img_curr))
         return kNoMoveFailed;
-    return TestNoMove(LayOut(*img_prev), LayOut(*img_curr), CurrentNoMoveLimits());
+    return TestNoMove(LayOutPair(*img_prev, *img_curr));
 }
 
 }  // namespace fpnavi
