@@ -8,43 +8,51 @@
 namespace bench {
 namespace {
 
-constexpr int32_t kWidth = kDefaultFp.width;
-constexpr int32_t kHeight = kDefaultFp.height;
 constexpr int32_t kBlock = 8;
 constexpr int32_t kReach = 8;    // pixels on each axis
 constexpr int32_t kPerAxis = 5;  // blocks
 
 // The first and last block on an axis leave kReach pixels to the edge.
-constexpr int32_t StartOf(int32_t block, int32_t side) {
+int32_t StartOf(int32_t block, int32_t side) {
     return kReach + block * (side - 2 * kReach - kBlock) / (kPerAxis - 1);
 }
 
 // The 8 pixels at p and the 8 below them.
-fpnavi::Bytes16 TwoRows(const uint8_t* p) {
+fpnavi::Bytes16 TwoRows(const uint8_t* p, int32_t width) {
 #if defined(__SSE2__)
-    return _mm_unpacklo_epi64(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(p)),
-                              _mm_loadl_epi64(reinterpret_cast<const __m128i*>(p + kWidth)));
+    return reinterpret_cast<fpnavi::Bytes16>(
+        _mm_unpacklo_epi64(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(p)),
+                           _mm_loadl_epi64(reinterpret_cast<const __m128i*>(p + width))));
 #else
     uint8_t rows[2 * kBlock];
     std::memcpy(rows, p, kBlock);
-    std::memcpy(rows + kBlock, p + kWidth, kBlock);
+    std::memcpy(rows + kBlock, p + width, kBlock);
     return fpnavi::Load16(rows);
 #endif
 }
 
+// The block's 8 x 8 pixels at p, two rows to a vector. width: of the frame, as the module has it:
+// known at run time only.
+struct BlockRows {
+    fpnavi::Bytes16 pairs[kBlock / 2];
+
+    BlockRows(const uint8_t* p, int32_t width) {
+        for (int32_t i = 0; i < kBlock / 2; ++i, p += 2 * width)
+            pairs[i] = TwoRows(p, width);
+    }
+};
+
 // The place in searched, around p, that differs least from the block at cut.
-Shift SearchBlock(const uint8_t* cut, const uint8_t* p) {
-    fpnavi::Bytes16 block[kBlock / 2];
-    for (int32_t i = 0; i < kBlock / 2; ++i)
-        block[i] = TwoRows(cut + 2 * i * kWidth);
+Shift SearchBlock(const uint8_t* cut, const uint8_t* p, int32_t width) {
+    const BlockRows block(cut, width);
     int32_t least = INT32_MAX;
     Shift best;
     for (int32_t dy = -kReach; dy <= kReach; ++dy) {
         for (int32_t dx = -kReach; dx <= kReach; ++dx) {
-            const uint8_t* const place = p + dy * kWidth + dx;
+            const BlockRows place(p + dy * width + dx, width);
             fpnavi::Sums sums = fpnavi::NoSums();
             for (int32_t i = 0; i < kBlock / 2; ++i)
-                sums = fpnavi::AddDiffs(sums, block[i], TwoRows(place + 2 * i * kWidth));
+                sums = fpnavi::AddDiffs(sums, block.pairs[i], place.pairs[i]);
             const int32_t sum = fpnavi::Total(sums);
             if (sum < least) {
                 least = sum;
@@ -64,13 +72,15 @@ double MiddleOf(double (&values)[kPerAxis * kPerAxis]) {
 }  // namespace
 
 Shift MatchBlocks(const FramePair& pair) {
+    const int32_t height = kDefaultFp.height;
+    const int32_t width = static_cast<int32_t>(pair.first.image.size()) / height;
     double x[kPerAxis * kPerAxis];
     double y[kPerAxis * kPerAxis];
     for (int32_t block = 0; block < kPerAxis * kPerAxis; ++block) {
         const int32_t place =
-            StartOf(block / kPerAxis, kHeight) * kWidth + StartOf(block % kPerAxis, kWidth);
+            StartOf(block / kPerAxis, height) * width + StartOf(block % kPerAxis, width);
         const Shift shift =
-            SearchBlock(pair.first.image.data() + place, pair.second.image.data() + place);
+            SearchBlock(pair.first.image.data() + place, pair.second.image.data() + place, width);
         x[block] = shift.x;
         y[block] = shift.y;
     }
