@@ -63,7 +63,7 @@ int32_t CompareFingerprints(int32_t n) {
     if (!AreComparable(&s_imagePrev, &s_imageCurr))
         return -1;
     const FramePair pair = LayOutPair(s_imagePrev, s_imageCurr);
-    const int32_t outcome = TestNoMove(pair);
+    const int32_t outcome = TestNoMove(pair, CurrentNoMoveLimits());
     if (outcome == kNoMoveMoved)
         return CoversLess(s_coverageMinFp) ? 0 : MatchPair(pair);
     s_voteInfo.vkey_fp[n] = VKEY_NONE;

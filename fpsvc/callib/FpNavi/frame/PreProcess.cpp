@@ -77,16 +77,16 @@ void StretchPixels(int32_t min, uint32_t range, uint32_t scale, NaviFrame_t* img
     }
 }
 
-// StretchRange of a frame with pixels. hist [in, out]: all greys of img, counted; those of the
-// finger area afterwards.
+// StretchRange of a frame with pixels, cutOff percent of the finger cut off at both ends.
+// hist [in, out]: all greys of img, counted; those of the finger area afterwards.
 //
 // Limits are in hundredths of a pixel. Where level 0 alone exceeds a limit, the percentile is 0.
 // For a limit >= 0, count > limit / 100 (truncated) is the same as 100 * count > limit. Where no
 // level exceeds the low limit, the high one is 0 or less, so that nothing is stretched.
-void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t (&hist)[kGreyLevels]) {
+void StretchFinger(NaviFrame_t* img, uint8_t scale, int32_t cutOff, int32_t (&hist)[kGreyLevels]) {
     const int32_t cnt = TakeOutBackground(*img, hist);  // at most 2^24
-    const int32_t lo = WrapMul(cnt, s_cutOffPercent);
-    const int32_t hi = WrapMul(cnt, WrapSub(100, s_cutOffPercent));
+    const int32_t lo = WrapMul(cnt, cutOff);
+    const int32_t hi = WrapMul(cnt, WrapSub(100, cutOff));
     const int32_t start = 100 * hist[0];  // at most 100 * 2^24 < 2^31
     const bool crossesLow = start <= lo;
     const bool crossesHigh = start < hi;
@@ -105,7 +105,7 @@ int32_t StretchRange(NaviFrame_t* img, uint8_t scale) {
         return -1;
     int32_t hist[kGreyLevels];
     CountBytes(img->pData, img->width * img->height, hist);
-    StretchFinger(img, scale, hist);
+    StretchFinger(img, scale, s_cutOffPercent, hist);
     return 0;
 }
 
@@ -124,7 +124,7 @@ int32_t ImgPreProcess(NaviFrame_t* img) {
     SplitGreys(hist, size, &thr, &scale);
     img->range = static_cast<uint8_t>(scale);
     GetFingerRidge(img, thr);
-    StretchFinger(img, kGreyMax, hist);
+    StretchFinger(img, kGreyMax, s_cutOffPercent, hist);
     return 0;
 }
 

@@ -1,5 +1,5 @@
 // The hardware double scan: the 8 x 8 zone maps of the last two frames, their measurement and the
-// displacement between them. Owns both maps; Gesture zeroes them.
+// displacement between them. Owns both maps; FpNaviClear zeroes them.
 #ifndef FPNAVI_DOUBLESCAN_H
 #define FPNAVI_DOUBLESCAN_H
 

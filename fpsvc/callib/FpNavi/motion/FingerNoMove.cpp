@@ -64,10 +64,11 @@ ShiftedColumns ShiftColumns(const Bands& bands, int32_t dc) {
 // The test of one pair of frames.
 class ShiftTest {
   public:
-    explicit ShiftTest(const FramePair& pair)
+    ShiftTest(const FramePair& pair, const NoMoveLimits& limits)
         : m_pair(pair),
-          m_rows(CutBands(pair.prev.height, s_boundHeight)),
-          m_columns(CutBands(pair.prev.width, s_boundWidth)) {}
+          m_limits(limits),
+          m_rows(CutBands(pair.prev.height, limits.boundHeight)),
+          m_columns(CutBands(pair.prev.width, limits.boundWidth)) {}
 
     // Some shift tested so far has enough common finger area.
     bool Counted() const { return m_counted; }
@@ -75,11 +76,11 @@ class ShiftTest {
     // Tests the shifts within the limits, shift 0 first, until one is below the tolerance. Returns
     // whether one is.
     bool TestShifts() {
-        if (s_smallMoveTolRow < 0 || s_smallMoveTolCol < 0)  // there is no shift to test
+        if (m_limits.tolRow < 0 || m_limits.tolCol < 0)  // there is no shift to test
             return false;
         // Beyond the frame's sides no pixel meets another.
-        const int32_t drMax = std::min(s_smallMoveTolRow, m_pair.prev.height);
-        const int32_t dcMax = std::min(s_smallMoveTolCol, m_pair.prev.width);
+        const int32_t drMax = std::min(m_limits.tolRow, m_pair.prev.height);
+        const int32_t dcMax = std::min(m_limits.tolCol, m_pair.prev.width);
         if (Test(0, ShiftColumns(m_columns, 0)))
             return true;
         for (int32_t dc = -dcMax; dc <= dcMax; ++dc) {
@@ -112,7 +113,7 @@ class ShiftTest {
         // its mean is that of the wrapped sum.
         const bool mayWrap = most * kGreyMax > std::numeric_limits<int32_t>::max();
         const int64_t limit =
-            mayWrap ? std::numeric_limits<int64_t>::max() : s_diffThresholdTol * most;
+            mayWrap ? std::numeric_limits<int64_t>::max() : m_limits.diffTol * most;
         int64_t sum = 0;
         for (const Pairing& region : regions) {
             if (sum < limit)
@@ -123,13 +124,14 @@ class ShiftTest {
         int32_t area = 0;
         for (const Pairing& region : regions)
             area += CommonArea(m_pair.prev, m_pair.curr, region);
-        if (area < 1 || area < s_overlapAreaMinNoMove)
+        if (area < 1 || area < m_limits.overlapAreaMin)
             return false;
         m_counted = true;
-        return sum < limit && Wrap(sum) / area < s_diffThresholdTol;
+        return sum < limit && Wrap(sum) / area < m_limits.diffTol;
     }
 
     const FramePair& m_pair;
+    const NoMoveLimits& m_limits;
     const Bands m_rows;
     const Bands m_columns;
     bool m_counted = false;
@@ -137,9 +139,14 @@ class ShiftTest {
 
 }  // namespace
 
-int32_t TestNoMove(const FramePair& pair) {
-    ShiftTest test(pair);
-    if (test.TestShifts() || (!test.Counted() && kMeanNone < s_diffThresholdTol))
+NoMoveLimits CurrentNoMoveLimits() {
+    return {s_boundWidth,      s_boundHeight,          s_smallMoveTolRow,
+            s_smallMoveTolCol, s_overlapAreaMinNoMove, s_diffThresholdTol};
+}
+
+int32_t TestNoMove(const FramePair& pair, const NoMoveLimits& limits) {
+    ShiftTest test(pair, limits);
+    if (test.TestShifts() || (!test.Counted() && kMeanNone < limits.diffTol))
         return kNoMoveResting;
     return test.Counted() ? kNoMoveMoved : kNoMoveUndetermined;
 }
@@ -147,7 +154,7 @@ int32_t TestNoMove(const FramePair& pair) {
 int32_t FingerNoMove(const NaviFrame_t* img_prev, const NaviFrame_t* img_curr) {
     if (!AreComparable(img_prev, img_curr))
         return kNoMoveFailed;
-    return TestNoMove(LayOutPair(*img_prev, *img_curr));
+    return TestNoMove(LayOutPair(*img_prev, *img_curr), CurrentNoMoveLimits());
 }
 
 }  // namespace fpnavi
