@@ -233,7 +233,7 @@ void ScoreGroup(const Group& group) {
     }
 }
 
-// The tables, which are to lie at diff [out].
+// The tables, which are to lie at diff [out]; null when only their sizes are wanted.
 PlacementTables PlanTables(const SearchParams& params, const TemplateSet& set, uint8_t* diff) {
     PlacementTables tables;
     tables.count = tables.placements = 0;
@@ -246,8 +246,10 @@ PlacementTables PlanTables(const SearchParams& params, const TemplateSet& set, u
         const int32_t rows = static_cast<int32_t>(where.iLast - where.iFirst + 1);
         const int32_t columns = static_cast<int32_t>(where.jLast - where.jFirst + 1);
         const Displacement first = DisplacementOf(set, MakeKey(0, i, j, k));
-        tables.of[tables.count++] = {k, i, j, first, rows, columns, diff + tables.placements};
+        tables.of[tables.count++] = {k, i, j, first, rows, columns, diff};
         tables.placements += rows * columns;
+        if (diff != nullptr)
+            diff += rows * columns;
     }
     return tables;
 }
