@@ -185,9 +185,11 @@ int32_t FindCandidate(int32_t* candidate_di, int32_t* candidate_dj) {
         return -1;
     const SearchMemory memory = PlanMemory(params, set, candidateList);
     RankCandidates(ScorePlacements(params, set, pair, memory), memory.keys, params.candidateNum);
-    const Candidates candidates = {candidate_di, candidate_dj, params.candidateNum};
-    for (int32_t m = 0; m < candidates.num; ++m)
-        candidates.Set(m, DisplacementOf(set, memory.keys[m]));
+    for (int32_t m = 0; m < params.candidateNum; ++m) {
+        const Displacement displacement = DisplacementOf(set, memory.keys[m]);
+        candidate_di[m] = displacement.di;
+        candidate_dj[m] = displacement.dj;
+    }
     std::free(candidateList);
     return 0;
 }
