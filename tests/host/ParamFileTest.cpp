@@ -126,7 +126,20 @@ TEST(ParamFile, ExtremesOf32BitsAreTaken) {
 TEST(ParamFile, UnknownNameIsRefusedWithItsPosition) {
     const std::string error = ParseError("s_minDelta = 4\n  s_minDelay = 4\n");
     EXPECT_THAT(error, StartsWith("p.toml:2:3: "));
-    EXPECT_THAT(error, HasSubstr("unknown parameter s_minDelay"));
+    EXPECT_THAT(error, HasSubstr("unknown parameter s_minDelay, did you mean 's_minDelta'?"));
+}
+
+TEST(ParamFile, ANameThatIsNearToNoneSaysWhereTheNamesAre) {
+    EXPECT_THAT(
+        ParseError("sensitivity = 4\n"),
+        HasSubstr("unknown parameter sensitivity, expected a name that fpnavi params lists"));
+}
+
+TEST(ParamFile, ABandIsSuggestedToo) {
+    EXPECT_THAT(ParseError("_NAVI_range_meen.RANGE_LOW = 4\n"),
+                HasSubstr("did you mean '_NAVI_range_mean.RANGE_LOW'?"));
+    EXPECT_THAT(ParseError("_NAVI_range_mean.RANGE_LOV = 4\n"),
+                HasSubstr("did you mean '_NAVI_range_mean.RANGE_LOW'?"));
 }
 
 TEST(ParamFile, UnknownHalfOfABandIsRefused) {

@@ -6,6 +6,7 @@
 #include <set>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
 #include "common/Error.h"
 #include "importers/FngImport.h"
@@ -113,28 +114,30 @@ int RunRaw(const Options& options) {
 
 void AddRawOptions(CLI::App* sub, Options* options, CLI::Option* paths) {
     CLI::Option* raw = sub->add_option("--raw", options->raw,
-                                       "Raw frames in sensor order, back to back: one gesture");
-    raw->excludes(paths);
+                                       "Raw frames in sensor order, back to back: one gesture")
+                           ->check(NotEmpty("a file"))
+                           ->excludes(paths);
     CLI::Option* mode = sub->add_option("--mode", options->mode, "Mode of the dump: fp, hg or ds")
-                            ->check(CLI::IsMember({"fp", "hg", "ds"}))
+                            ->check(OneOf("mode", host::ModeNames()))
                             ->needs(raw);
     raw->needs(mode);
     sub->add_option("--registers", options->registers,
                     "Two little-endian 32-bit words a frame: register 24, register 28 (mode ds)")
+        ->check(NotEmpty("a file"))
         ->needs(raw);
     sub->add_option("--params", options->params,
                     "TOML file of values by name, over the defaults of the mode")
+        ->check(NotEmpty("a file"))
         ->needs(raw);
     sub->add_option("--end", options->end, "How the gesture ended: lift (default) or timeout")
-        ->check(CLI::IsMember({"lift", "timeout"}))
+        ->check(OneOf("end", host::EndNames()))
         ->needs(raw);
     sub->add_option("--label", options->label,
                     "The true key: NONE, UP, DOWN, RIGHT, LEFT or NO_MOVE")
-        ->check([](const std::string& name) {
-            return host::ParseKey(name) ? std::string() : "no key: " + name;
-        })
+        ->check(OneOf("key", host::KeyNames()))
         ->needs(raw);
     sub->add_option("--id", options->id, "Id of the gesture (default: the dump's file name)")
+        ->check(GestureId())
         ->needs(raw);
 }
 
@@ -146,7 +149,8 @@ void AddImport(CLI::App* app, Action* action) {
     sub->add_option("CORPUS", options->corpus, "Corpus to add to; made if there is none")
         ->required();
     CLI::Option* paths = sub->add_option("PATH", options->paths,
-                                         ".fng files, or directories of them with their index.csv");
+                                         ".fng files, or directories of them with their index.csv")
+                             ->check(NotEmpty("a file or a directory"));
     AddRawOptions(sub, options.get(), paths);
     sub->add_flag("--json", options->json, "One JSON object a line");
     sub->footer(

@@ -2,6 +2,7 @@
 #include <memory>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
 #include "parameters/ParamFile.h"
 #include "parameters/ParamTable.h"
@@ -49,9 +50,10 @@ void AddParams(CLI::App* app, Action* action) {
     CLI::App* sub = app->add_subcommand("params", "List the parameters and what they do");
     auto options = std::make_shared<Options>();
     sub->add_option("--params", options->file,
-                    "TOML file of values by name, over those of the mode");
+                    "TOML file of values by name, over those of the mode")
+        ->check(NotEmpty("a file"));
     sub->add_option("--mode", options->mode, "Mode: fp (default), hg or ds")
-        ->check(CLI::IsMember({"fp", "hg", "ds"}));
+        ->check(OneOf("mode", host::ModeNames()));
     sub->add_flag("--json", options->json, "One JSON object a line");
     sub->callback([options, action] { *action = [options] { return Run(*options); }; });
 }

@@ -5,6 +5,7 @@
 #include <memory>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
 #include "ResultLines.h"
 #include "common/Error.h"
@@ -114,11 +115,13 @@ void AddReplay(CLI::App* app, Action* action) {
     auto options = std::make_shared<Options>();
     sub->add_option("CORPUS", options->corpus, "Corpus to replay")->required();
     CLI::Option* gesture =
-        sub->add_option("--gesture", options->gesture, "Explain this gesture frame by frame");
+        sub->add_option("--gesture", options->gesture, "Explain this gesture frame by frame")
+            ->check(GestureId());
     sub->add_option("--params", options->params,
-                    "TOML file of values by name, over those of the recordings");
+                    "TOML file of values by name, over those of the recordings")
+        ->check(NotEmpty("a file"));
     sub->add_option("--jobs", options->jobs, "Processes at once (default: one for each processor)")
-        ->check(CLI::Range(1, 1024))
+        ->check(WholeNumber(1, 1024))
         ->excludes(gesture);
     sub->add_flag("--json", options->json, "One JSON object a line");
     sub->add_flag("--quiet", options->quiet, "The summary only")->excludes(gesture);

@@ -5,6 +5,7 @@
 #include <optional>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
 #include "importers/RawImport.h"
 #include "parameters/ParamFile.h"
@@ -14,7 +15,7 @@
 namespace command {
 namespace {
 
-constexpr int32_t kCallsMax = 1'000'000;
+constexpr uint64_t kCallsMax = 1'000'000;
 
 struct Options {
     std::optional<uint64_t> seed;
@@ -182,24 +183,30 @@ void AddTune(CLI::App* app, Action* action) {
     CLI::App* sub = app->add_subcommand("tune", "Calibrate the DC register, call by call");
     auto options = std::make_shared<Options>();
     CLI::Option* seed =
-        sub->add_option("--seed", options->seed, "Simulated front end to draw (default 1)");
+        sub->add_option("--seed", options->seed, "Simulated front end to draw (default 1)")
+            ->check(WholeNumber());
     sub->add_option("--raw", options->raw,
                     "Recorded frames instead: raw, in sensor order, back to back")
+        ->check(NotEmpty("a file"))
         ->excludes(seed);
     sub->add_option("--layout", options->layout,
                     "Layout of the DC register: 1 low byte, 0 differences of bytes (default: "
                     "iDCMode of the parameters)")
-        ->check(CLI::Range(0, 1));
+        ->check(WholeNumber(0, 1));
     sub->add_option("--start", options->start,
                     "DC register of the first frame, e.g. 0x123456C0 (default: as drawn; DC 191 "
-                    "for recorded frames)");
+                    "for recorded frames)")
+        ->check(Register());
     sub->add_option("--gain20", options->gain20,
-                    "First gain register (default: as drawn; 0x00020700 for recorded frames)");
+                    "First gain register (default: as drawn; 0x00020700 for recorded frames)")
+        ->check(Register());
     sub->add_option("--gain2c", options->gain2C,
-                    "Second gain register (default: as drawn; 0x00000102 for recorded frames)");
-    sub->add_option("--params", options->params, "TOML file of values by name, over the defaults");
+                    "Second gain register (default: as drawn; 0x00000102 for recorded frames)")
+        ->check(Register());
+    sub->add_option("--params", options->params, "TOML file of values by name, over the defaults")
+        ->check(NotEmpty("a file"));
     sub->add_option("--calls", options->calls, "Calls at most (default 64)")
-        ->check(CLI::Range(1, kCallsMax));
+        ->check(WholeNumber(1, kCallsMax));
     sub->add_flag("--json", options->json, "One JSON object a line");
     sub->footer(
         "Examples:\n"
