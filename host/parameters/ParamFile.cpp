@@ -65,7 +65,7 @@ ParamSetting SettingOf(const toml::key& key, const toml::node& node, const std::
     const std::optional<size_t> index = ParamIndex(name);
     if (!index)
         throw UnknownName(file, key.source().begin, name);
-    const toml::source_position& at = key.source().begin;
+    const toml::source_position& at = node.source().begin;
     return {*index, IntegerOf(node, name, file), fmt::format("{}:{}", at.line, at.column)};
 }
 

@@ -15,13 +15,14 @@ namespace host {
 
 // One parameter that a file sets.
 struct ParamSetting {
-    size_t index;  // in the block
-    int32_t value;
-    std::string place;  // of its name in the file: "line:column"
+    size_t index = 0;  // in the block
+    int32_t value = 0;
+    std::string place;  // of the value in the file: "line:column"
 };
 
-// What a file sets, each parameter once, in no order. Error, with "line:column", for a file that is
-// no TOML, an unknown name, a value that is no integer or one outside the 32-bit range.
+// What a file sets, each parameter once, in the order of their names. Error, with "line:column",
+// for a file that is no TOML, an unknown name, a value that is no integer or one outside the 32-bit
+// range.
 std::vector<ParamSetting> ReadParamSettings(const std::string& path);
 
 // The same for text; fileName is what errors name.

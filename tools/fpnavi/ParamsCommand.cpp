@@ -4,7 +4,7 @@
 #include "Commands.h"
 #include "OptionChecks.h"
 #include "Output.h"
-#include "parameters/ParamFile.h"
+#include "Settings.h"
 #include "parameters/ParamTable.h"
 #include "recording/Keys.h"
 
@@ -19,9 +19,9 @@ struct Options {
 
 int Run(const Options& options) {
     const host::Mode mode = host::ParseMode(options.mode).value_or(host::Mode::Fp);
-    host::ParamBlock params = host::ParamsForMode(mode, false);
-    if (!options.file.empty())
-        params = host::ReadParamFile(options.file, params);
+    const std::vector<host::ParamSetting> settings = ReadSettings(options.file);
+    const host::ParamBlock params = host::WithSettings(settings, host::ParamsForMode(mode, false));
+    WarnOfUnread(options.file, settings);
     const Table table(
         {{"index", 0, true}, {"name", 36}, {"value", 6, true}, {"default", 0, true}, {"meaning"}});
     if (!options.json)

@@ -8,6 +8,7 @@
 #include "OptionChecks.h"
 #include "Output.h"
 #include "ResultLines.h"
+#include "Settings.h"
 #include "common/Error.h"
 #include "recording/Keys.h"
 #include "replay/ReplayCorpus.h"
@@ -32,7 +33,12 @@ int ExitCode(bool wrong) {
 }
 
 host::ParamOverrides Overrides(const Options& options) {
-    return options.params.empty() ? host::ParamOverrides() : host::ReadOverrides(options.params);
+    host::ParamOverrides overrides;
+    const std::vector<host::ParamSetting> settings = ReadSettings(options.params);
+    for (const host::ParamSetting& setting : settings)
+        overrides.emplace_back(setting.index, setting.value);
+    WarnOfUnread(options.params, settings);
+    return overrides;
 }
 
 int RunOne(const Options& options) {

@@ -7,8 +7,9 @@
 #include "Commands.h"
 #include "OptionChecks.h"
 #include "Output.h"
+#include "Settings.h"
 #include "importers/RawImport.h"
-#include "parameters/ParamFile.h"
+#include "parameters/ParamCheck.h"
 #include "replay/TuneRun.h"
 #include "simulator/FrontEnd.h"
 
@@ -48,9 +49,10 @@ const char* FlagName(int32_t flag) {
 }
 
 host::ParamBlock ParamsOf(const Options& options) {
-    host::ParamBlock params = host::DefaultParams();
-    if (!options.params.empty())
-        params = host::ReadParamFile(options.params, params);
+    const std::vector<host::ParamSetting> settings = ReadSettings(options.params);
+    host::ParamBlock params = host::WithSettings(settings, host::DefaultParams());
+    host::CheckImage(settings, options.params, params);
+    WarnOfUnread(options.params, settings);
     if (options.layout)
         host::ParamValue(params, "iDCMode") = *options.layout;
     return params;
@@ -132,6 +134,13 @@ void WriteTextCall(const Table& table, size_t number, const host::TuneCall& call
                shown(std::to_string(call.step)), Cell(call.result)});
 }
 
+// Frames in the band at the end, or nothing to calibrate.
+bool IsCalibrated(const host::TuneRun& run) {
+    if (run.end == host::TuneEnd::NotNeeded)
+        return true;
+    return run.end == host::TuneEnd::InBand && !run.calls.back().saturated;
+}
+
 int Run(const Options& options) {
     host::TuneSetup setup;
     setup.params = ParamsOf(options);
@@ -174,7 +183,7 @@ int Run(const Options& options) {
         Write(fmt::format("\n{} after {} calls, register {}, gain registers {} and {}\n",
                           host::TuneEndName(run.end), run.calls.size(), Hex(run.lastRegister),
                           Hex(plan.gain20), Hex(plan.gain2C)));
-    return kFine;
+    return IsCalibrated(run) ? kFine : kFound;
 }
 
 }  // namespace
