@@ -1,6 +1,6 @@
-/* A sensor that is not there: five strokes of a round finger with ring-shaped ridges, one frame
- * each 20 ms, then silence. Frames are nine tiles with unread gaps between them, as the default
- * parameters have it, and become brighter with the DC register. */
+/* A sensor that is not there: four strokes of a round finger with ring-shaped ridges and a rest in
+ * the middle, one frame each 20 ms, then silence. Frames are nine tiles with unread gaps between
+ * them, as the default parameters have it, and become brighter with the DC register. */
 #include <stdlib.h>
 
 #include "sensor.h"
@@ -11,15 +11,26 @@ enum {
     BLOCK_COLUMNS = SENSOR_WIDTH / BLOCK_WIDTH,
     WINDOW_WIDTH = 120, /* of the sensor's area that the tiles lie in, gaps included */
     WINDOW_HEIGHT = 68,
-    IDLE_FRAMES = 20, /* for the calibration, before the first finger */
-    STROKE_FRAMES = 14,
+    IDLE_FRAMES = 20,   /* for the calibration, before the first finger */
+    STROKE_FRAMES = 14, /* an even number */
     PAUSE_FRAMES = 2,
     FRAME_MS = 20,
     STEP = 5, /* pixels a frame */
 };
 
-/* Direction of each stroke, x to the right, y downwards. */
-static const struct { int x, y; } s_strokes[] = {{1, 0}, {-1, 0}, {0, -1}, {0, 1}, {0, 0}};
+#ifndef REST_FRAMES
+#define REST_FRAMES STROKE_FRAMES /* of the finger that rests; a test has it rest for long */
+#endif
+
+/* Direction of each stroke, x to the right, y downwards, and its frames with a finger. */
+static const struct {
+    int x, y, frames;
+} s_strokes[] = {{1, 0, STROKE_FRAMES},
+                 {-1, 0, STROKE_FRAMES},
+                 {0, 0, REST_FRAMES},
+                 {0, -1, STROKE_FRAMES},
+                 {0, 1, STROKE_FRAMES}};
+enum { STROKES = sizeof s_strokes / sizeof s_strokes[0] };
 
 static int s_frame = 0;
 static uint32_t s_dc = 0x90;
@@ -42,12 +53,24 @@ static int finger_grey(int dx, int dy) {
     return phase < 30 ? 40 + 4 * phase : 40 + 4 * (60 - phase);
 }
 
+/* The stroke of this frame: -1 before the first, STROKES after the last. *step: its frame, 0 when
+ * the finger is in the middle of the sensor. */
+static int stroke_now(int* step) {
+    int since = s_frame - IDLE_FRAMES;
+    int stroke = 0;
+    if (since < 0)
+        return -1;
+    while (stroke < STROKES && since >= s_strokes[stroke].frames + PAUSE_FRAMES)
+        since -= s_strokes[stroke++].frames + PAUSE_FRAMES;
+    *step = since - STROKE_FRAMES / 2;
+    return stroke;
+}
+
 /* Grey of a pixel in this frame, before the DC register. */
 static int scene_grey(int x, int y) {
-    const int since = s_frame - IDLE_FRAMES;
-    const int stroke = since / (STROKE_FRAMES + PAUSE_FRAMES);
-    const int step = since % (STROKE_FRAMES + PAUSE_FRAMES) - STROKE_FRAMES / 2;
-    if (since >= 0 && step < STROKE_FRAMES / 2) {
+    int step = 0;
+    const int stroke = stroke_now(&step);
+    if (stroke >= 0 && stroke < STROKES && step + STROKE_FRAMES / 2 < s_strokes[stroke].frames) {
         const int grey = finger_grey(x - WINDOW_WIDTH / 2 - s_strokes[stroke].x * STEP * step,
                                      y - WINDOW_HEIGHT / 2 - s_strokes[stroke].y * STEP * step);
         if (grey >= 0)
@@ -57,8 +80,8 @@ static int scene_grey(int x, int y) {
 }
 
 int sensor_read_frame(uint8_t* raw) {
-    const int strokes = (int)(sizeof s_strokes / sizeof s_strokes[0]);
-    if (s_frame >= IDLE_FRAMES + strokes * (STROKE_FRAMES + PAUSE_FRAMES))
+    int step = 0;
+    if (stroke_now(&step) == STROKES)
         return -1;
     for (int row = 0; row < SENSOR_HEIGHT; ++row) {
         for (int column = 0; column < SENSOR_WIDTH; ++column) {

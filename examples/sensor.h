@@ -1,4 +1,4 @@
-/* What gesture_loop.c wants of a sensor's driver. A service writes these five functions over its
+/* What gesture_loop.c wants of a sensor's driver. A service writes these functions over its
  * own; pretend_sensor.c draws a finger instead. */
 #ifndef FPNAVI_EXAMPLES_SENSOR_H
 #define FPNAVI_EXAMPLES_SENSOR_H

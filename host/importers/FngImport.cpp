@@ -9,6 +9,7 @@
 
 #include "common/Error.h"
 #include "common/Files.h"
+#include "importers/FileId.h"
 #include "parameters/ParamTable.h"
 #include "recording/Keys.h"
 
@@ -209,7 +210,7 @@ Gesture ReadFng(const std::string& path) {
     FngFile file{path, ReadWholeFile(path)};
     CheckStart(file);
     Gesture gesture;
-    gesture.id = std::filesystem::path(path).stem().string();
+    gesture.id = IdOfFile(path);
     gesture.notes = "imported from " + std::filesystem::path(path).filename().string();
     ReadModeAndParams(file, gesture);
     CheckGeometry(file, gesture.geometry);

@@ -32,18 +32,22 @@ struct FngIndexRow {
 std::map<std::string, FngIndexRow> ReadFngIndex(const std::string& path);
 
 // One .fng file: frames, registers, positions, presence, the label of its header and the
-// parameters of its mode and layout. The id is the file's name without .fng. Error at the byte
-// offset for a file that deviates from the format in anything.
+// parameters of its mode and layout. The id is the file's name without .fng, which has to be UTF-8.
+// Error at the byte offset for a file that deviates from the format in anything.
 Gesture ReadFng(const std::string& path);
 
 // The gesture of a .fng file with what its row of the index adds: accepted keys, tier, and as tags
 // kind, source and quality. Error when the row contradicts the file.
 void ApplyFngIndex(const FngIndexRow& row, const std::string& indexPath, Gesture& gesture);
 
-// Visits the gesture of a .fng file, or those of all .fng files of a directory in the order of
-// their names. An index.csv beside them is used for the files that it lists; other files have only
-// their header's label. Error for a directory without .fng files.
-void ImportFng(const std::string& path, const std::function<void(Gesture&&)>& visit);
+// Gets each gesture with the file that it comes from.
+using FngVisitor = std::function<void(Gesture&&, const std::string& file)>;
+
+// Visits the gesture of a .fng file, or those of all .fng files (in any case) of a directory and of
+// the directories below it, each in the order of names. An index.csv beside them is used for the
+// files that it lists; other files have only their header's label. Error for a directory without
+// .fng files, and for a row without a file in the index of a directory.
+void ImportFng(const std::string& path, const FngVisitor& visit);
 
 // The same, all in memory.
 std::vector<Gesture> ImportFng(const std::string& path);

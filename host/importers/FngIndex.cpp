@@ -1,22 +1,19 @@
-// The index.csv beside .fng files, and the import of a file or a directory with it.
+// The index.csv beside .fng files.
 #include <fmt/format.h>
 
 #include <algorithm>
 #include <charconv>
-#include <filesystem>
 #include <string_view>
 
 #include "common/Error.h"
 #include "common/Files.h"
+#include "common/Text.h"
 #include "importers/FngImport.h"
 #include "recording/Keys.h"
 
 namespace host {
 
 namespace {
-
-constexpr const char* kIndexName = "index.csv";
-constexpr const char* kExtension = ".fng";
 
 // The file has no quoted fields: names and numbers only.
 std::vector<std::string> Split(std::string_view text, char separator) {
@@ -69,8 +66,7 @@ class CsvLine {
 int32_t KeyOf(const CsvLine& line, const std::string& name, const char* column) {
     const std::optional<int32_t> key = ParseKey(name);
     if (!key)
-        line.Fail(
-            fmt::format("{} '{}', expected NONE, UP, DOWN, RIGHT, LEFT or NO_MOVE", column, name));
+        line.Fail(fmt::format("{} '{}', {}", column, name, Suggestion(name, KeyNames())));
     return *key;
 }
 
@@ -135,22 +131,6 @@ std::vector<std::string> LinesOf(const std::string& path) {
     return lines;
 }
 
-std::vector<std::string> FngFilesOf(const std::string& directory) {
-    std::vector<std::string> files;
-    std::error_code error;
-    for (std::filesystem::directory_iterator entry(directory, error), end; !error && entry != end;
-         entry.increment(error)) {
-        if (entry->path().extension() == kExtension)
-            files.push_back(entry->path().string());
-    }
-    if (error)
-        throw Error(directory, "", "cannot be listed: " + error.message());
-    if (files.empty())
-        throw Error(directory, "", "has no .fng files, expected at least one");
-    std::sort(files.begin(), files.end());
-    return files;
-}
-
 }  // namespace
 
 std::map<std::string, FngIndexRow> ReadFngIndex(const std::string& path) {
@@ -196,33 +176,6 @@ void ApplyFngIndex(const FngIndexRow& row, const std::string& indexPath, Gesture
         gesture.tags.push_back("source:" + row.source);
     if (!row.quality.empty())
         gesture.tags.push_back("quality:" + row.quality);
-}
-
-void ImportFng(const std::string& path, const std::function<void(Gesture&&)>& visit) {
-    std::error_code error;
-    const bool isDirectory = std::filesystem::is_directory(path, error);
-    const std::filesystem::path directory =
-        isDirectory ? std::filesystem::path(path) : std::filesystem::path(path).parent_path();
-    const std::vector<std::string> files =
-        isDirectory ? FngFilesOf(path) : std::vector<std::string>{path};
-    const std::string indexPath = (directory / kIndexName).string();
-    std::map<std::string, FngIndexRow> rows;
-    // One that is there and cannot be read is an error, a link to nowhere too.
-    if (std::filesystem::exists(std::filesystem::symlink_status(indexPath, error)))
-        rows = ReadFngIndex(indexPath);
-    for (const std::string& file : files) {
-        Gesture gesture = ReadFng(file);
-        const auto row = rows.find(gesture.id);
-        if (row != rows.end())
-            ApplyFngIndex(row->second, indexPath, gesture);
-        visit(std::move(gesture));
-    }
-}
-
-std::vector<Gesture> ImportFng(const std::string& path) {
-    std::vector<Gesture> gestures;
-    ImportFng(path, [&](Gesture&& gesture) { gestures.push_back(std::move(gesture)); });
-    return gestures;
 }
 
 }  // namespace host

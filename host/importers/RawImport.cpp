@@ -8,6 +8,8 @@
 
 #include "common/Error.h"
 #include "common/Files.h"
+#include "importers/FileId.h"
+#include "parameters/ParamCheck.h"
 #include "recording/Keys.h"
 #include "store/Store.h"
 
@@ -22,8 +24,11 @@ void ReadFrames(const RawRecording& recording, Gesture& gesture) {
     const std::vector<uint8_t> bytes = ReadWholeFile(recording.framesPath);
     // CheckGesture has limited both sides to 4096.
     const auto frameSize = static_cast<size_t>(g.Width() * g.Height());
-    const std::string expected = fmt::format("frames of {} bytes ({} x {}, mode {})", frameSize,
-                                             g.Width(), g.Height(), ModeName(gesture.mode));
+    const std::string settings =
+        ImageSettings(recording.settings, recording.paramFile, gesture.params);
+    const std::string expected =
+        fmt::format("frames of {} bytes ({} x {}, mode {}{}{})", frameSize, g.Width(), g.Height(),
+                    ModeName(gesture.mode), settings.empty() ? "" : "; ", settings);
     if (bytes.empty())
         throw Error(recording.framesPath, "", "the file is empty, expected " + expected);
     const size_t remainder = bytes.size() % frameSize;
@@ -69,9 +74,12 @@ void ReadRegisters(const RawRecording& recording, Gesture& gesture) {
 Gesture ImportRaw(const RawRecording& recording) {
     const std::filesystem::path path(recording.framesPath);
     Gesture gesture;
-    gesture.id = recording.id.empty() ? path.stem().string() : recording.id;
+    gesture.id = recording.id.empty() ? IdOfFile(recording.framesPath) : recording.id;
     gesture.params = recording.params;
     ParamValue(gesture.params, "s_modeFlag") = static_cast<int32_t>(recording.mode);
+    gesture.params = WithSettings(recording.settings, gesture.params);
+    CheckMode(recording.settings, recording.paramFile, recording.mode);
+    CheckImage(recording.settings, recording.paramFile, gesture.params);
     gesture.mode = recording.mode;
     gesture.geometry = GeometryOf(gesture.params);
     gesture.end = recording.end;

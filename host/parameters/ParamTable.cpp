@@ -9,6 +9,8 @@ namespace host {
 
 namespace {
 
+constexpr const char* kNeverRead = "stored, never read";
+
 constexpr std::array<ParamInfo, FPNAVI_PARAM_NUM> kTable = {{
     {"s_sensorBackFlag", 0, "1 swaps RIGHT and LEFT in the result of the vote"},
     {"s_directionControlFlag", 3,
@@ -45,7 +47,7 @@ constexpr std::array<ParamInfo, FPNAVI_PARAM_NUM> kTable = {{
     {"iDCMode", 1,
      "encoding of the DC register: 1 low byte, 0 two byte differences; others leave it alone"},
     {"_NAVI_DC_REF", 128, "lowest DC value the tuning accepts; below it the DC is reset"},
-    {"_NAVI_TOP_REF", 128, "stored, never read"},
+    {"_NAVI_TOP_REF", 128, kNeverRead},
     {"_NAVI_INPUT_K", 374,
      "grey levels per DC step at the reference gain, in hundredths; sizes the tuning's steps"},
     {"_NAVI_GAIN_REF", 10002, "packed code of the reference gain that _NAVI_INPUT_K holds for"},
@@ -53,8 +55,8 @@ constexpr std::array<ParamInfo, FPNAVI_PARAM_NUM> kTable = {{
      "tuning: recommended top grey from here on; classified, decides nothing"},
     {"_NAVI_range_recommend.RANGE_HIGH", 220,
      "tuning: recommended top grey up to here; classified, decides nothing"},
-    {"_NAVI_range_effective.RANGE_LOW", 160, "stored, never read"},
-    {"_NAVI_range_effective.RANGE_HIGH", 240, "stored, never read"},
+    {"_NAVI_range_effective.RANGE_LOW", 160, kNeverRead},
+    {"_NAVI_range_effective.RANGE_HIGH", 240, kNeverRead},
     {"_NAVI_range_mean.RANGE_LOW", 140,
      "tuning: block mean below it is out of the effective band: the DC steps"},
     {"_NAVI_range_mean.RANGE_HIGH", 220,
@@ -141,8 +143,8 @@ constexpr std::array<ParamInfo, FPNAVI_PARAM_NUM> kTable = {{
      "fp finger test: a spread of the 16 block means at or above it is a finger"},
     {"s_highSensitiveMode", 1,
      "hg finger test: 1 accepts a darkest quadrant whose mean is at or below s_meanThreshold"},
-    {"s_fftFreqLow", 5, "stored, never read"},
-    {"s_fftFreqHigh", 12, "stored, never read"},
+    {"s_fftFreqLow", 5, kNeverRead},
+    {"s_fftFreqHigh", 12, kNeverRead},
     {"s_DoubleScanCvrThreshold", 10,
      "mode 2 finger test: percent of set map cells that must be exceeded for a finger"},
     {"s_logShowFlag", 0, "1 writes the diagnostic log lines"},
@@ -178,6 +180,10 @@ std::optional<size_t> ParamIndex(std::string_view name) {
     if (found == IndexByName().end())
         return std::nullopt;
     return found->second;
+}
+
+bool IsRead(size_t index) {
+    return std::string_view(kTable[index].meaning) != kNeverRead;
 }
 
 ParamBlock DefaultParams() {

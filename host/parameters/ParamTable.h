@@ -23,6 +23,9 @@ const std::array<ParamInfo, FPNAVI_PARAM_NUM>& ParamTable();
 // Index of the parameter in the block; empty for an unknown name.
 std::optional<size_t> ParamIndex(std::string_view name);
 
+// False for a parameter that is stored and that no step of the module reads.
+bool IsRead(size_t index);
+
 ParamBlock DefaultParams();
 
 // Value of the parameter in params; name must be known.

@@ -2,7 +2,8 @@
 #include "recording/Keys.h"
 
 #include <array>
-#include <cctype>
+
+#include "common/Text.h"
 
 namespace host {
 
@@ -12,17 +13,6 @@ constexpr std::array<std::string_view, 6> kKeyNames = {"NONE",  "UP",   "DOWN",
                                                        "RIGHT", "LEFT", "NO_MOVE"};
 constexpr std::array<std::string_view, 3> kModeNames = {"fp", "hg", "ds"};
 constexpr std::array<std::string_view, 2> kEndNames = {"lift", "timeout"};
-
-bool EqualInAnyCase(std::string_view a, std::string_view b) {
-    if (a.size() != b.size())
-        return false;
-    for (size_t i = 0; i < a.size(); ++i) {
-        if (std::toupper(static_cast<unsigned char>(a[i])) !=
-            std::toupper(static_cast<unsigned char>(b[i])))
-            return false;
-    }
-    return true;
-}
 
 template <size_t N>
 std::optional<int32_t> Find(const std::array<std::string_view, N>& names, std::string_view name) {
@@ -40,6 +30,11 @@ std::string NameAt(const std::array<std::string_view, N>& names, int32_t value) 
     return std::string(names[static_cast<size_t>(value)]);
 }
 
+template <size_t N>
+std::vector<std::string_view> AllOf(const std::array<std::string_view, N>& names) {
+    return {names.begin(), names.end()};
+}
+
 }  // namespace
 
 std::string KeyName(int32_t key) {
@@ -54,6 +49,10 @@ bool IsKey(int32_t key) {
     return key >= VKEY_NONE && key <= VKEY_NO_MOVE;
 }
 
+std::vector<std::string_view> KeyNames() {
+    return AllOf(kKeyNames);
+}
+
 std::string ModeName(Mode mode) {
     return NameAt(kModeNames, static_cast<int32_t>(mode));
 }
@@ -63,6 +62,10 @@ std::optional<Mode> ParseMode(std::string_view name) {
     return value ? std::optional<Mode>(static_cast<Mode>(*value)) : std::nullopt;
 }
 
+std::vector<std::string_view> ModeNames() {
+    return AllOf(kModeNames);
+}
+
 std::string EndName(GestureEnd end) {
     return NameAt(kEndNames, static_cast<int32_t>(end));
 }
@@ -70,6 +73,10 @@ std::string EndName(GestureEnd end) {
 std::optional<GestureEnd> ParseEnd(std::string_view name) {
     const std::optional<int32_t> value = Find(kEndNames, name);
     return value ? std::optional<GestureEnd>(static_cast<GestureEnd>(*value)) : std::nullopt;
+}
+
+std::vector<std::string_view> EndNames() {
+    return AllOf(kEndNames);
 }
 
 }  // namespace host

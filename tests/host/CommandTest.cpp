@@ -214,6 +214,45 @@ TEST_F(Command, AnUnknownParameterIsNamedWithItsPlace) {
     }
 }
 
+TEST_F(Command, ParametersThatContradictTheDumpAreBadInputAndNothingIsPrinted) {
+    WriteText(Path("dump.bin"), std::string(56 * 36, 'x'));
+    WriteText(Path("ds.toml"), "s_fftFreqLow = 1\ns_modeFlag = 2\n");
+    WriteText(Path("wide.toml"), "s_blockColNumFp = 600\n");
+    const Outcome mode = Run("import c.db --raw dump.bin --mode fp --params ds.toml");
+    EXPECT_EQ(mode.exitCode, 3);
+    EXPECT_THAT(mode.err, StartsWith("fpnavi: ds.toml:2:14: s_modeFlag = 2 is mode ds"));
+    EXPECT_THAT(mode.out, IsEmpty());
+    for (const char* arguments :
+         {"import c.db --raw dump.bin --mode fp --params wide.toml", "tune --params wide.toml",
+          "tune --params wide.toml --raw dump.bin"}) {
+        const Outcome size = Run(arguments);
+        EXPECT_EQ(size.exitCode, 3) << arguments;
+        EXPECT_THAT(size.err, StartsWith("fpnavi: wide.toml:1:19: s_blockColNumFp = 600 makes"))
+            << arguments;
+        EXPECT_THAT(size.out, IsEmpty()) << arguments;
+    }
+    EXPECT_FALSE(std::filesystem::exists(Path("c.db")));
+}
+
+TEST_F(Command, AParameterThatNothingReadsGivesAWarning) {
+    WriteCorpus("c.db", {MovesRight("a", VKEY_RIGHT)});
+    WriteText(Path("dump.bin"), std::string(56 * 36, 'x'));
+    WriteText(Path("unread.toml"), "s_minDelta = 4\n_NAVI_TOP_REF = 1\ns_fftFreqLow = 2\n");
+    for (const char* arguments :
+         {"replay c.db --params unread.toml", "replay c.db --gesture a --params unread.toml",
+          "params --params unread.toml", "tune --seed 2 --params unread.toml",
+          "import new.db --raw dump.bin --mode fp --params unread.toml"}) {
+        const Outcome outcome = Run(arguments);
+        EXPECT_EQ(outcome.exitCode, 0) << arguments;
+        EXPECT_EQ(outcome.err,
+                  "fpnavi: warning: unread.toml:2:17: _NAVI_TOP_REF is stored and never read: it "
+                  "changes nothing\n"
+                  "fpnavi: warning: unread.toml:3:16: s_fftFreqLow is stored and never read: it "
+                  "changes nothing\n")
+            << arguments;
+    }
+}
+
 TEST_F(Command, AnUnknownGestureIsBadInput) {
     WriteCorpus("c.db", {MovesRight("a", VKEY_RIGHT)});
     const Outcome outcome = Run("replay c.db --gesture nobody");

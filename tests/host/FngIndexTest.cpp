@@ -1,6 +1,7 @@
 // The index beside .fng files, and the import of directories with it.
 #include <gmock/gmock.h>
 
+#include <filesystem>
 #include <utility>
 
 #include "FngTestSupport.h"
@@ -112,6 +113,56 @@ TEST(FngIndex, RowThatContradictsTheFileIsRefused) {
         EXPECT_THAT(IndexError(std::string(kColumns) + row + "\n"),
                     HasSubstr(std::string("index.csv:2: ") + column + " of 'g' differs"))
             << row;
+}
+
+TEST(FngIndex, ARowWithoutItsFileIsRefused) {
+    const std::string directory = DirectoryWithIndex(std::string(kColumns) + kRow +
+                                                     "h,hard,fp,tiled,stroke:UP,UP,UP,lift,2\n");
+    EXPECT_THAT(ErrorOf([&] { host::ImportFng(directory); }),
+                HasSubstr("index.csv:3: 'h' has no file, expected h.fng beside the index"));
+    // Who imports a single file wants no other.
+    EXPECT_EQ(host::ImportFng(directory + "/g.fng").size(), 1U);
+}
+
+TEST(FngDirectory, ExtensionsInCapitalsAreTaken) {
+    const std::string directory = TestDirectory();
+    WriteBytes(directory + "/A.FNG", FngBytes());
+    const std::vector<Gesture> gestures = host::ImportFng(directory);
+    ASSERT_EQ(gestures.size(), 1U);
+    EXPECT_EQ(gestures[0].id, "A");
+}
+
+TEST(FngDirectory, DirectoriesBelowAreTakenWithTheirOwnIndex) {
+    const std::string directory = TestDirectory();
+    std::filesystem::create_directories(directory + "/day/morning");
+    WriteBytes(directory + "/day/morning/g.fng", FngBytes());
+    WriteText(directory + "/day/morning/index.csv", std::string(kColumns) + kRow);
+    WriteBytes(directory + "/z.fng", FngBytes());
+    const std::vector<Gesture> gestures = host::ImportFng(directory);
+    ASSERT_EQ(gestures.size(), 2U);
+    EXPECT_EQ(gestures[0].id, "z");  // a directory's files come before those below it
+    EXPECT_EQ(gestures[0].tier, "");
+    EXPECT_EQ(gestures[1].id, "g");
+    EXPECT_EQ(gestures[1].tier, "hard");
+}
+
+TEST(FngDirectory, ALinkBackIsRefused) {
+    const std::string directory = TestDirectory();
+    WriteBytes(directory + "/g.fng", FngBytes());
+    std::filesystem::create_directory_symlink(directory, directory + "/loop");
+    EXPECT_THAT(ErrorOf([&] { host::ImportFng(directory); }),
+                StartsWith(directory + "/loop: is reached twice"));
+}
+
+TEST(FngDirectory, ANameThatIsNoUtf8IsRefused) {
+    const std::string file = TestDirectory() + "/a\xFFz.fng";
+    WriteBytes(file, FngBytes());
+    EXPECT_THAT(ErrorOf([&] { host::ImportFng(file); }), HasSubstr("the name is no UTF-8"));
+}
+
+TEST(FngIndex, AKeyThatIsNearlyOneIsNamed) {
+    EXPECT_THAT(IndexError(std::string(kColumns) + "g,hard,fp,tiled,stroke:UP,PU,UP,lift,2\n"),
+                HasSubstr("index.csv:2: expect 'PU', did you mean 'UP'?"));
 }
 
 TEST(FngIndex, DirectoryWithoutRecordingsIsRefused) {

@@ -87,6 +87,27 @@ TEST(ParamTable, UnknownModeFlagActsAsFp) {
     EXPECT_EQ(host::ModeOf(params), host::Mode::Fp);
 }
 
+// No source of the module reads them; tests/docs looks there.
+TEST(ParamTable, FiveAreStoredAndNeverRead) {
+    std::set<std::string> names;
+    for (size_t i = 0; i < host::ParamTable().size(); ++i) {
+        if (!host::IsRead(i))
+            names.insert(host::ParamTable()[i].name);
+    }
+    EXPECT_EQ(names, (std::set<std::string>{"_NAVI_TOP_REF", "_NAVI_range_effective.RANGE_LOW",
+                                            "_NAVI_range_effective.RANGE_HIGH", "s_fftFreqLow",
+                                            "s_fftFreqHigh"}));
+}
+
+TEST(ParamFile, SettingsHaveThePlaceOfTheirValue) {
+    const std::vector<host::ParamSetting> settings =
+        host::ParseParamSettings("# one\n  s_minDelta = 5\n", "p.toml");
+    ASSERT_EQ(settings.size(), 1U);
+    EXPECT_EQ(settings[0].index, ParamIndex("s_minDelta"));
+    EXPECT_EQ(settings[0].value, 5);
+    EXPECT_EQ(settings[0].place, "2:16");
+}
+
 TEST(ParamFile, EmptyTextKeepsTheDefaults) {
     EXPECT_EQ(ParseParams("", "p.toml"), DefaultParams());
 }
@@ -126,7 +147,20 @@ TEST(ParamFile, ExtremesOf32BitsAreTaken) {
 TEST(ParamFile, UnknownNameIsRefusedWithItsPosition) {
     const std::string error = ParseError("s_minDelta = 4\n  s_minDelay = 4\n");
     EXPECT_THAT(error, StartsWith("p.toml:2:3: "));
-    EXPECT_THAT(error, HasSubstr("unknown parameter s_minDelay"));
+    EXPECT_THAT(error, HasSubstr("unknown parameter s_minDelay, did you mean 's_minDelta'?"));
+}
+
+TEST(ParamFile, ANameThatIsNearToNoneSaysWhereTheNamesAre) {
+    EXPECT_THAT(
+        ParseError("sensitivity = 4\n"),
+        HasSubstr("unknown parameter sensitivity, expected a name that fpnavi params lists"));
+}
+
+TEST(ParamFile, ABandIsSuggestedToo) {
+    EXPECT_THAT(ParseError("_NAVI_range_meen.RANGE_LOW = 4\n"),
+                HasSubstr("did you mean '_NAVI_range_mean.RANGE_LOW'?"));
+    EXPECT_THAT(ParseError("_NAVI_range_mean.RANGE_LOV = 4\n"),
+                HasSubstr("did you mean '_NAVI_range_mean.RANGE_LOW'?"));
 }
 
 TEST(ParamFile, UnknownHalfOfABandIsRefused) {

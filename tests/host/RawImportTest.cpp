@@ -107,4 +107,63 @@ TEST(RawImport, GeometryThatMakesNoSenseIsRefused) {
     }
 }
 
+host::RawRecording RawWithSettings(size_t frameBytes, const char* toml) {
+    host::RawRecording recording = RawWith(frameBytes);
+    recording.paramFile = "p.toml";
+    recording.settings = host::ParseParamSettings(toml, recording.paramFile);
+    return recording;
+}
+
+TEST(RawImport, SettingsOfAFileAreLaidOverTheParameters) {
+    const Gesture gesture = host::ImportRaw(RawWithSettings(kPixels, "s_minDelta = 7\n"));
+    EXPECT_EQ(host::ParamValue(gesture.params, "s_minDelta"), 7);
+    EXPECT_EQ(host::ParamValue(gesture.params, "s_fpImp"), 80);
+}
+
+TEST(RawImport, ASettingOfAnotherModeIsRefusedAtItsPlace) {
+    EXPECT_THAT(ErrorOf([&] { host::ImportRaw(RawWithSettings(kPixels, "\ns_modeFlag = 2\n")); }),
+                StartsWith("p.toml:2:14: s_modeFlag = 2 is mode ds, expected a value of mode fp"));
+    host::RawRecording hg = RawWithSettings(40 * 48, "s_modeFlag = 0\n");
+    hg.mode = host::Mode::Hg;
+    EXPECT_THAT(ErrorOf([&] { host::ImportRaw(hg); }),
+                StartsWith("p.toml:1:14: s_modeFlag = 0 is mode fp, expected a value of mode hg"));
+}
+
+TEST(RawImport, AnyValueOfTheSameModeIsKept) {
+    const Gesture gesture = host::ImportRaw(RawWithSettings(kPixels, "s_modeFlag = 5\n"));
+    EXPECT_EQ(host::ParamValue(gesture.params, "s_modeFlag"), 5);
+    EXPECT_EQ(gesture.mode, host::Mode::Fp);
+}
+
+TEST(RawImport, ASettingWithoutAUsableImageIsRefusedAtItsPlace) {
+    EXPECT_THAT(
+        ErrorOf([&] { host::ImportRaw(RawWithSettings(kPixels, "s_blockWidthFp = 600\n")); }),
+        StartsWith("p.toml:1:18: s_blockWidthFp = 600 makes the image 4200 pixels wide"));
+    EXPECT_THAT(
+        ErrorOf([&] { host::ImportRaw(RawWithSettings(kPixels, "s_blockRowNumFp = -1\n")); }),
+        StartsWith("p.toml:1:19: s_blockRowNumFp = -1 makes the image -2 pixels high (-1 blocks "
+                   "of 2), expected 1 "
+                   "to 4096"));
+    // Two negative ones make a product that looks like an image.
+    EXPECT_THAT(ErrorOf([&] {
+                    host::ImportRaw(
+                        RawWithSettings(kPixels, "s_blockRowNumFp = -18\ns_blockHeightFp = -2\n"));
+                }),
+                StartsWith("p.toml:2:19: s_blockHeightFp = -2 makes"));
+}
+
+TEST(RawImport, SettingsOfTheOtherModesImageDoNotMatter) {
+    EXPECT_EQ(host::ImportRaw(RawWithSettings(kPixels, "s_blockWidthHg = 600\n")).frames.size(),
+              1U);
+}
+
+TEST(RawImport, ARemainderNamesTheSettingsOfTheImage) {
+    const std::string error = ErrorOf([&] {
+        host::ImportRaw(RawWithSettings(kPixels, "s_minDelta = 3\ns_blockColNumFp = 8\n"));
+    });
+    EXPECT_THAT(error, HasSubstr("dump.raw: byte 0: a remainder of 2016 bytes after 0 frames"));
+    EXPECT_THAT(error, HasSubstr("2304 bytes (64 x 36, mode fp; s_blockColNumFp = 8 at "
+                                 "p.toml:2:19)"));
+}
+
 }  // namespace

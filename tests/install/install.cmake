@@ -1,12 +1,6 @@
 # Builds and installs the library of KIND (static or shared) below WORK, then builds and runs the
 # consumer against the installed package. The shared library must export exactly nine functions.
-function(run)
-    execute_process(COMMAND ${ARGV} RESULT_VARIABLE result OUTPUT_VARIABLE output
-                    ERROR_VARIABLE output)
-    if(NOT result EQUAL 0)
-        message(FATAL_ERROR "${ARGV} failed:\n${output}")
-    endif()
-endfunction()
+include(${CMAKE_CURRENT_LIST_DIR}/run.cmake)
 
 file(REMOVE_RECURSE ${WORK})
 set(shared OFF)

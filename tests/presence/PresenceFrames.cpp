@@ -37,7 +37,7 @@ std::vector<FrameGroup> RecordedGroups(const std::string& directory) {
     const std::string indexPath = directory + "/index.csv";
     const auto index = host::ReadFngIndex(indexPath);
     std::map<std::string, std::vector<KnownFrame>> framesOfFinger;  // in alphabetical order
-    host::ImportFng(directory, [&](host::Gesture&& gesture) {
+    host::ImportFng(directory, [&](host::Gesture&& gesture, const std::string&) {
         const auto row = index.find(gesture.id);
         if (row == index.end())
             throw host::Error(indexPath, gesture.id, "expected a row for this recording");

@@ -2,15 +2,17 @@
 #include <fmt/core.h>
 
 #include <filesystem>
+#include <map>
 #include <memory>
 #include <set>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
+#include "Settings.h"
 #include "common/Error.h"
 #include "importers/FngImport.h"
 #include "importers/RawImport.h"
-#include "parameters/ParamFile.h"
 #include "recording/Keys.h"
 #include "store/Store.h"
 
@@ -27,6 +29,7 @@ struct Options {
     std::string end = "lift";
     std::string label;
     std::string id;
+    bool skipExisting = false;
     bool json = false;
 };
 
@@ -39,33 +42,65 @@ host::Store OpenOrCreate(const std::string& path) {
     return Exists(path) ? host::Store::OpenForAppending(path) : host::Store::Create(path);
 }
 
-void Report(const Options& options, int64_t gestures, int64_t frames, const host::Store& store) {
+// What an import did.
+struct Counts {
+    int64_t gestures = 0;
+    int64_t frames = 0;
+    int64_t skipped = 0;  // the corpus has their ids already
+};
+
+void Append(const host::Gesture& gesture, host::Store* store, Counts* counts) {
+    store->Append(gesture);
+    ++counts->gestures;
+    counts->frames += static_cast<int64_t>(gesture.frames.size());
+}
+
+void Report(const Options& options, const Counts& counts, const host::Store& store) {
     if (options.json) {
         WriteJson("import", {{"corpus", options.corpus},
-                             {"gestures", gestures},
-                             {"frames", frames},
+                             {"gestures", counts.gestures},
+                             {"frames", counts.frames},
+                             {"skipped", counts.skipped},
                              {"total", store.Count()}});
         return;
     }
-    Write(fmt::format("{}: {} gestures with {} frames imported, {} in all\n",
-                      Printable(options.corpus), gestures, frames, store.Count()));
+    const std::string skipped =
+        options.skipExisting ? fmt::format("{} skipped, ", counts.skipped) : "";
+    Write(fmt::format("{}: {} gestures with {} frames imported, {}{} in all\n",
+                      Printable(options.corpus), counts.gestures, counts.frames, skipped,
+                      store.Count()));
+}
+
+[[noreturn]] void FailTaken(const std::string& file, const std::string& id,
+                            const std::string& taker) {
+    throw host::Error(file, fmt::format("gesture '{}'", id),
+                      fmt::format("the id is taken by {}, expected a new one", taker));
+}
+
+// Where an id was seen: the corpus, or a file of this import.
+using Takers = std::map<std::string, std::string>;
+
+Takers TakersOf(const std::string& corpus) {
+    Takers takers;
+    if (Exists(corpus)) {
+        for (std::string& id : host::Store::OpenForReading(corpus).Ids())
+            takers.emplace(std::move(id), corpus);
+    }
+    return takers;
 }
 
 // Reads all recordings once before anything is written, so that a bad one among them leaves the
 // corpus as it was. Returns their number.
 int64_t CheckPaths(const Options& options) {
-    std::set<std::string> ids;
-    if (Exists(options.corpus)) {
-        for (std::string& id : host::Store::OpenForReading(options.corpus).Ids())
-            ids.insert(std::move(id));
-    }
+    Takers takers = TakersOf(options.corpus);
+    std::set<std::string> imported;
     int64_t count = 0;
     for (const std::string& path : options.paths)
-        host::ImportFng(path, [&](host::Gesture&& gesture) {
-            if (!ids.insert(gesture.id).second)
-                throw host::Error(
-                    path, fmt::format("gesture '{}'", gesture.id),
-                    fmt::format("the id is taken, expected one that is new to {}", options.corpus));
+        host::ImportFng(path, [&](host::Gesture&& gesture, const std::string& file) {
+            const auto [taker, isNew] = takers.emplace(gesture.id, file);
+            const bool isTwice = !imported.insert(gesture.id).second;
+            if (isTwice || (!isNew && !options.skipExisting))
+                FailTaken(file, gesture.id, taker->second);
             ++count;
         });
     return count;
@@ -74,20 +109,22 @@ int64_t CheckPaths(const Options& options) {
 int RunFng(const Options& options) {
     const int64_t count = CheckPaths(options);
     host::Store store = OpenOrCreate(options.corpus);
-    int64_t frames = 0;
+    Counts counts;
     {
         // All or nothing: after a kill or a full disk the same command can be run again.
         host::Store::Batch batch(store);
         Progress progress("imported", count, true);
         for (const std::string& path : options.paths)
-            host::ImportFng(path, [&](host::Gesture&& gesture) {
-                store.Append(gesture);
-                frames += static_cast<int64_t>(gesture.frames.size());
+            host::ImportFng(path, [&](host::Gesture&& gesture, const std::string&) {
+                if (options.skipExisting && store.Contains(gesture.id))
+                    ++counts.skipped;
+                else
+                    Append(gesture, &store, &counts);
                 progress.Step();
             });
         batch.Commit();
     }
-    Report(options, count, frames, store);
+    Report(options, counts, store);
     return kFine;
 }
 
@@ -98,43 +135,53 @@ int RunRaw(const Options& options) {
     recording.registersPath = options.registers;
     recording.mode = host::ParseMode(options.mode).value();
     recording.params = host::ParamsForMode(recording.mode, false);
-    if (!options.params.empty())
-        recording.params = host::ReadParamFile(options.params, recording.params);
+    recording.paramFile = options.params;
+    recording.settings = ReadSettings(options.params);
     recording.end = host::ParseEnd(options.end).value();
     if (!options.label.empty())
         recording.label = host::ParseKey(options.label);
     recording.libraryVersion = FPNAVI_VERSION;
     const host::Gesture gesture = host::ImportRaw(recording);
+    WarnOfUnread(options.params, recording.settings);
     host::Store store = OpenOrCreate(options.corpus);
-    store.Append(gesture);
-    Report(options, 1, static_cast<int64_t>(gesture.frames.size()), store);
+    Counts counts;
+    const bool isTaken = store.Contains(gesture.id);
+    if (isTaken && !options.skipExisting)
+        FailTaken(options.raw, gesture.id, options.corpus);
+    if (isTaken)
+        ++counts.skipped;
+    else
+        Append(gesture, &store, &counts);
+    Report(options, counts, store);
     return kFine;
 }
 
 void AddRawOptions(CLI::App* sub, Options* options, CLI::Option* paths) {
     CLI::Option* raw = sub->add_option("--raw", options->raw,
-                                       "Raw frames in sensor order, back to back: one gesture");
-    raw->excludes(paths);
+                                       "Raw frames in sensor order, back to back: one gesture")
+                           ->check(NotEmpty("a file"))
+                           ->excludes(paths);
     CLI::Option* mode = sub->add_option("--mode", options->mode, "Mode of the dump: fp, hg or ds")
-                            ->check(CLI::IsMember({"fp", "hg", "ds"}))
+                            ->check(OneOf("mode", host::ModeNames()))
                             ->needs(raw);
     raw->needs(mode);
     sub->add_option("--registers", options->registers,
                     "Two little-endian 32-bit words a frame: register 24, register 28 (mode ds)")
+        ->check(NotEmpty("a file"))
         ->needs(raw);
     sub->add_option("--params", options->params,
                     "TOML file of values by name, over the defaults of the mode")
+        ->check(NotEmpty("a file"))
         ->needs(raw);
     sub->add_option("--end", options->end, "How the gesture ended: lift (default) or timeout")
-        ->check(CLI::IsMember({"lift", "timeout"}))
+        ->check(OneOf("end", host::EndNames()))
         ->needs(raw);
     sub->add_option("--label", options->label,
                     "The true key: NONE, UP, DOWN, RIGHT, LEFT or NO_MOVE")
-        ->check([](const std::string& name) {
-            return host::ParseKey(name) ? std::string() : "no key: " + name;
-        })
+        ->check(OneOf("key", host::KeyNames()))
         ->needs(raw);
     sub->add_option("--id", options->id, "Id of the gesture (default: the dump's file name)")
+        ->check(GestureId())
         ->needs(raw);
 }
 
@@ -146,8 +193,11 @@ void AddImport(CLI::App* app, Action* action) {
     sub->add_option("CORPUS", options->corpus, "Corpus to add to; made if there is none")
         ->required();
     CLI::Option* paths = sub->add_option("PATH", options->paths,
-                                         ".fng files, or directories of them with their index.csv");
+                                         ".fng files, or directories of them, with their index.csv")
+                             ->check(NotEmpty("a file or a directory"));
     AddRawOptions(sub, options.get(), paths);
+    sub->add_flag("--skip-existing", options->skipExisting,
+                  "Leave out gestures whose ids the corpus has already");
     sub->add_flag("--json", options->json, "One JSON object a line");
     sub->footer(
         "Examples:\n"

@@ -104,6 +104,10 @@ void WriteError(const std::string& message) {
     fmt::print(stderr, "fpnavi: {}\n", message);
 }
 
+void WriteWarning(const std::string& message) {
+    WriteError("warning: " + message);
+}
+
 Table::Table(std::vector<Column> columns) : m_columns(std::move(columns)) {
     for (Column& column : m_columns)
         column.width = std::max(column.width, column.title.size());

@@ -44,6 +44,9 @@ std::string Printable(const std::string& text);
 // "fpnavi: message" on stderr.
 void WriteError(const std::string& message);
 
+// "fpnavi: warning: message" on stderr.
+void WriteWarning(const std::string& message);
+
 // A column of a text table. A cell wider than its column moves those after it to the right.
 struct Column {
     std::string title;

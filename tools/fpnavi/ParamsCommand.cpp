@@ -2,8 +2,9 @@
 #include <memory>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
-#include "parameters/ParamFile.h"
+#include "Settings.h"
 #include "parameters/ParamTable.h"
 #include "recording/Keys.h"
 
@@ -18,9 +19,9 @@ struct Options {
 
 int Run(const Options& options) {
     const host::Mode mode = host::ParseMode(options.mode).value_or(host::Mode::Fp);
-    host::ParamBlock params = host::ParamsForMode(mode, false);
-    if (!options.file.empty())
-        params = host::ReadParamFile(options.file, params);
+    const std::vector<host::ParamSetting> settings = ReadSettings(options.file);
+    const host::ParamBlock params = host::WithSettings(settings, host::ParamsForMode(mode, false));
+    WarnOfUnread(options.file, settings);
     const Table table(
         {{"index", 0, true}, {"name", 36}, {"value", 6, true}, {"default", 0, true}, {"meaning"}});
     if (!options.json)
@@ -49,9 +50,10 @@ void AddParams(CLI::App* app, Action* action) {
     CLI::App* sub = app->add_subcommand("params", "List the parameters and what they do");
     auto options = std::make_shared<Options>();
     sub->add_option("--params", options->file,
-                    "TOML file of values by name, over those of the mode");
+                    "TOML file of values by name, over those of the mode")
+        ->check(NotEmpty("a file"));
     sub->add_option("--mode", options->mode, "Mode: fp (default), hg or ds")
-        ->check(CLI::IsMember({"fp", "hg", "ds"}));
+        ->check(OneOf("mode", host::ModeNames()));
     sub->add_flag("--json", options->json, "One JSON object a line");
     sub->callback([options, action] { *action = [options] { return Run(*options); }; });
 }

@@ -5,8 +5,10 @@
 #include <memory>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
 #include "ResultLines.h"
+#include "Settings.h"
 #include "common/Error.h"
 #include "recording/Keys.h"
 #include "replay/ReplayCorpus.h"
@@ -31,7 +33,12 @@ int ExitCode(bool wrong) {
 }
 
 host::ParamOverrides Overrides(const Options& options) {
-    return options.params.empty() ? host::ParamOverrides() : host::ReadOverrides(options.params);
+    host::ParamOverrides overrides;
+    const std::vector<host::ParamSetting> settings = ReadSettings(options.params);
+    for (const host::ParamSetting& setting : settings)
+        overrides.emplace_back(setting.index, setting.value);
+    WarnOfUnread(options.params, settings);
+    return overrides;
 }
 
 int RunOne(const Options& options) {
@@ -114,11 +121,13 @@ void AddReplay(CLI::App* app, Action* action) {
     auto options = std::make_shared<Options>();
     sub->add_option("CORPUS", options->corpus, "Corpus to replay")->required();
     CLI::Option* gesture =
-        sub->add_option("--gesture", options->gesture, "Explain this gesture frame by frame");
+        sub->add_option("--gesture", options->gesture, "Explain this gesture frame by frame")
+            ->check(GestureId());
     sub->add_option("--params", options->params,
-                    "TOML file of values by name, over those of the recordings");
+                    "TOML file of values by name, over those of the recordings")
+        ->check(NotEmpty("a file"));
     sub->add_option("--jobs", options->jobs, "Processes at once (default: one for each processor)")
-        ->check(CLI::Range(1, 1024))
+        ->check(WholeNumber(1, 1024))
         ->excludes(gesture);
     sub->add_flag("--json", options->json, "One JSON object a line");
     sub->add_flag("--quiet", options->quiet, "The summary only")->excludes(gesture);

@@ -5,6 +5,7 @@
 #include <memory>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
 #include "simulator/Corpus.h"
 #include "store/Store.h"
@@ -12,7 +13,7 @@
 namespace command {
 namespace {
 
-constexpr int64_t kCountMax = 100'000'000;
+constexpr uint64_t kCountMax = 100'000'000;
 
 struct Options {
     std::string corpus;
@@ -64,10 +65,11 @@ void AddSynth(CLI::App* app, Action* action) {
     sub->add_option("CORPUS", options->corpus, "Corpus to write; must not exist yet")->required();
     sub->add_option("--count", options->count, "Number of gestures")
         ->required()
-        ->check(CLI::Range(int64_t{1}, kCountMax));
-    sub->add_option("--seed", options->seed, "Equal seeds give equal gestures (default 1)");
+        ->check(WholeNumber(1, kCountMax));
+    sub->add_option("--seed", options->seed, "Equal seeds give equal gestures (default 1)")
+        ->check(WholeNumber());
     sub->add_option("--first", options->first, "Index of the first gesture in its seed (default 0)")
-        ->check(CLI::Range(int64_t{0}, kCountMax));
+        ->check(WholeNumber(0, kCountMax));
     CLI::Option* force = sub->add_flag("--force", options->force, "Replace an existing corpus");
     sub->add_flag("--append", options->append, "Add to an existing corpus")->excludes(force);
     sub->add_flag("--json", options->json, "One JSON object a line");

@@ -5,16 +5,18 @@
 #include <optional>
 
 #include "Commands.h"
+#include "OptionChecks.h"
 #include "Output.h"
+#include "Settings.h"
 #include "importers/RawImport.h"
-#include "parameters/ParamFile.h"
+#include "parameters/ParamCheck.h"
 #include "replay/TuneRun.h"
 #include "simulator/FrontEnd.h"
 
 namespace command {
 namespace {
 
-constexpr int32_t kCallsMax = 1'000'000;
+constexpr uint64_t kCallsMax = 1'000'000;
 
 struct Options {
     std::optional<uint64_t> seed;
@@ -47,9 +49,10 @@ const char* FlagName(int32_t flag) {
 }
 
 host::ParamBlock ParamsOf(const Options& options) {
-    host::ParamBlock params = host::DefaultParams();
-    if (!options.params.empty())
-        params = host::ReadParamFile(options.params, params);
+    const std::vector<host::ParamSetting> settings = ReadSettings(options.params);
+    host::ParamBlock params = host::WithSettings(settings, host::DefaultParams());
+    host::CheckImage(settings, options.params, params);
+    WarnOfUnread(options.params, settings);
     if (options.layout)
         host::ParamValue(params, "iDCMode") = *options.layout;
     return params;
@@ -131,6 +134,13 @@ void WriteTextCall(const Table& table, size_t number, const host::TuneCall& call
                shown(std::to_string(call.step)), Cell(call.result)});
 }
 
+// Frames in the band at the end, or nothing to calibrate.
+bool IsCalibrated(const host::TuneRun& run) {
+    if (run.end == host::TuneEnd::NotNeeded)
+        return true;
+    return run.end == host::TuneEnd::InBand && !run.calls.back().saturated;
+}
+
 int Run(const Options& options) {
     host::TuneSetup setup;
     setup.params = ParamsOf(options);
@@ -173,7 +183,7 @@ int Run(const Options& options) {
         Write(fmt::format("\n{} after {} calls, register {}, gain registers {} and {}\n",
                           host::TuneEndName(run.end), run.calls.size(), Hex(run.lastRegister),
                           Hex(plan.gain20), Hex(plan.gain2C)));
-    return kFine;
+    return IsCalibrated(run) ? kFine : kFound;
 }
 
 }  // namespace
@@ -182,24 +192,30 @@ void AddTune(CLI::App* app, Action* action) {
     CLI::App* sub = app->add_subcommand("tune", "Calibrate the DC register, call by call");
     auto options = std::make_shared<Options>();
     CLI::Option* seed =
-        sub->add_option("--seed", options->seed, "Simulated front end to draw (default 1)");
+        sub->add_option("--seed", options->seed, "Simulated front end to draw (default 1)")
+            ->check(WholeNumber());
     sub->add_option("--raw", options->raw,
                     "Recorded frames instead: raw, in sensor order, back to back")
+        ->check(NotEmpty("a file"))
         ->excludes(seed);
     sub->add_option("--layout", options->layout,
                     "Layout of the DC register: 1 low byte, 0 differences of bytes (default: "
                     "iDCMode of the parameters)")
-        ->check(CLI::Range(0, 1));
+        ->check(WholeNumber(0, 1));
     sub->add_option("--start", options->start,
                     "DC register of the first frame, e.g. 0x123456C0 (default: as drawn; DC 191 "
-                    "for recorded frames)");
+                    "for recorded frames)")
+        ->check(Register());
     sub->add_option("--gain20", options->gain20,
-                    "First gain register (default: as drawn; 0x00020700 for recorded frames)");
+                    "First gain register (default: as drawn; 0x00020700 for recorded frames)")
+        ->check(Register());
     sub->add_option("--gain2c", options->gain2C,
-                    "Second gain register (default: as drawn; 0x00000102 for recorded frames)");
-    sub->add_option("--params", options->params, "TOML file of values by name, over the defaults");
+                    "Second gain register (default: as drawn; 0x00000102 for recorded frames)")
+        ->check(Register());
+    sub->add_option("--params", options->params, "TOML file of values by name, over the defaults")
+        ->check(NotEmpty("a file"));
     sub->add_option("--calls", options->calls, "Calls at most (default 64)")
-        ->check(CLI::Range(1, kCallsMax));
+        ->check(WholeNumber(1, kCallsMax));
     sub->add_flag("--json", options->json, "One JSON object a line");
     sub->footer(
         "Examples:\n"

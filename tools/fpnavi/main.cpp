@@ -1,11 +1,13 @@
 // fpnavi: records of finger gestures made, imported, replayed and explained.
 #include <fmt/core.h>
 
+#include <algorithm>
 #include <csignal>
 #include <exception>
 
 #include "Commands.h"
 #include "Output.h"
+#include "common/Text.h"
 
 namespace {
 
@@ -17,8 +19,24 @@ constexpr const char* kFooter = R"(Examples:
   fpnavi params --mode hg
   fpnavi tune --seed 1
 
-Exit codes: 0 fine, 1 wrong keys found, 2 usage, 3 bad input or output.
+Exit codes: 0 fine, 1 wrong keys or a failed calibration, 2 usage, 3 bad input or output.
 Recordings hold pictures of fingerprints: store and share them as biometric data.)";
+
+// The first word that is no option names the subcommand. Checked before all else, since a --help
+// beside an unknown one would be taken for a question about the program.
+void CheckSubcommand(const CLI::App& app, int argc, char** argv) {
+    const auto isWord = [](const char* text) { return text[0] != '-'; };
+    char** const word = std::find_if(argv + 1, argv + argc, isWord);
+    if (word == argv + argc)
+        return;
+    std::vector<std::string> names;
+    for (const CLI::App* sub : app.get_subcommands([](const CLI::App*) { return true; }))
+        names.push_back(sub->get_name());
+    if (std::find(names.begin(), names.end(), *word) != names.end())
+        return;
+    throw CLI::ValidationError(fmt::format("unknown subcommand '{}', {}", command::Printable(*word),
+                                           host::Suggestion(*word, {names.begin(), names.end()})));
+}
 
 int Run(int argc, char** argv) {
     CLI::App app{"Finger navigation: makes, imports, replays and explains gesture recordings.",
@@ -33,6 +51,7 @@ int Run(int argc, char** argv) {
     command::AddParams(&app, &action);
     command::AddTune(&app, &action);
     try {
+        CheckSubcommand(app, argc, argv);
         app.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
         // Help and version arrive here too, with code 0.

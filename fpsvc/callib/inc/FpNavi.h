@@ -6,9 +6,15 @@
  * GetNaviBlock, vmk_fp_navigation_detect_finger_status, OrientationCalc; when the finger has left
  * or the host's time-out has expired, Voting. SetNaviParam comes once before everything else.
  *
- * Directions: x grows to the right (higher columns), y grows upwards (towards row 0). */
+ * Directions: x grows to the right (higher columns), y grows upwards (towards row 0).
+ *
+ * Wants C11 or C++11, or later: -std=c11. */
 #ifndef FPSVC_CALLIB_INC_FPNAVI_H
 #define FPSVC_CALLIB_INC_FPNAVI_H
+
+#if !defined(__cplusplus) && (!defined(__STDC_VERSION__) || __STDC_VERSION__ < 201112L)
+#error "FpNavi.h wants C11 or later: compile with -std=c11"
+#endif
 
 #include <assert.h>
 #include <stddef.h>
@@ -23,6 +29,11 @@ extern "C" {
 #else
 #define FPNAVI_API
 #endif
+
+/* Version of the library that this header belongs to. */
+#define FPNAVI_VERSION_MAJOR 1
+#define FPNAVI_VERSION_MINOR 7
+#define FPNAVI_VERSION_PATCH 10
 
 /* Key values: the results of Voting and the verdicts of the motion methods for one frame pair. */
 typedef enum NaviVkey_t {
