@@ -14,9 +14,15 @@ namespace host {
 
 namespace {
 
+using Settings = std::vector<ParamSetting>;
+
+std::string PlaceText(const toml::source_position& position) {
+    return fmt::format("{}:{}", position.line, position.column);
+}
+
 Error ErrorAt(const std::string& file, const toml::source_position& position,
               const std::string& problem) {
-    return Error(file, fmt::format("{}:{}", position.line, position.column), problem);
+    return Error(file, PlaceText(position), problem);
 }
 
 std::string TypeText(toml::node_type type) {
@@ -30,7 +36,8 @@ bool IsBand(std::string_view name) {
     return ParamIndex(std::string(name) + ".RANGE_LOW").has_value();
 }
 
-int32_t IntegerOf(const toml::node& node, const std::string& name, const std::string& file) {
+ParamSetting SettingOf(size_t index, const toml::node& node, const std::string& name,
+                       const std::string& file) {
     const toml::value<int64_t>* const integer = node.as_integer();
     if (integer == nullptr)
         throw ErrorAt(
@@ -42,11 +49,11 @@ int32_t IntegerOf(const toml::node& node, const std::string& name, const std::st
         throw ErrorAt(file, node.source().begin,
                       fmt::format("{} = {} is out of range, expected {} to {}", name,
                                   integer->get(), kMin, kMax));
-    return static_cast<int32_t>(integer->get());
+    return {index, static_cast<int32_t>(integer->get()), PlaceText(node.source().begin)};
 }
 
 void ReadBand(const toml::table& band, const std::string& bandName, const std::string& file,
-              ParamBlock& params) {
+              Settings& settings) {
     for (const auto& [key, node] : band) {
         const std::string name = fmt::format("{}.{}", bandName, key.str());
         const std::optional<size_t> index = ParamIndex(name);
@@ -55,11 +62,11 @@ void ReadBand(const toml::table& band, const std::string& bandName, const std::s
                           fmt::format("unknown parameter {}, expected {}.RANGE_LOW or "
                                       "{}.RANGE_HIGH",
                                       name, bandName, bandName));
-        params[*index] = IntegerOf(node, name, file);
+        settings.push_back(SettingOf(*index, node, name, file));
     }
 }
 
-void ReadTable(const toml::table& table, const std::string& file, ParamBlock& params) {
+void ReadTable(const toml::table& table, const std::string& file, Settings& settings) {
     for (const auto& [key, node] : table) {
         const std::string name(key.str());
         if (IsBand(name)) {
@@ -69,7 +76,7 @@ void ReadTable(const toml::table& table, const std::string& file, ParamBlock& pa
                               fmt::format("{} is of type {}, expected {}.RANGE_LOW and "
                                           "{}.RANGE_HIGH",
                                           name, TypeText(node.type()), name, name));
-            ReadBand(*band, name, file, params);
+            ReadBand(*band, name, file, settings);
             continue;
         }
         // A quoted key with a dot would be a second spelling of a band's half.
@@ -79,29 +86,42 @@ void ReadTable(const toml::table& table, const std::string& file, ParamBlock& pa
                           fmt::format("unknown parameter {}, expected a name of the parameter "
                                       "block",
                                       name));
-        params[*index] = IntegerOf(node, name, file);
+        settings.push_back(SettingOf(*index, node, name, file));
     }
+}
+
+ParamBlock Applied(const Settings& settings, ParamBlock params) {
+    for (const ParamSetting& setting : settings)
+        params[setting.index] = setting.value;
+    return params;
 }
 
 }  // namespace
 
-ParamBlock ParseParams(std::string_view text, const std::string& fileName, const ParamBlock& base) {
-    ParamBlock params = base;
+std::vector<ParamSetting> ParseParamSettings(std::string_view text, const std::string& fileName) {
+    Settings settings;
     try {
-        ReadTable(toml::parse(text, fileName), fileName, params);
+        ReadTable(toml::parse(text, fileName), fileName, settings);
     } catch (const toml::parse_error& error) {
         throw ErrorAt(
             fileName, error.source().begin,
             fmt::format("{}, expected TOML lines such as s_minDelta = 4", error.description()));
     }
-    return params;
+    return settings;
+}
+
+std::vector<ParamSetting> ReadParamSettings(const std::string& path) {
+    const std::vector<uint8_t> content = ReadWholeFile(path);
+    return ParseParamSettings(
+        std::string_view(reinterpret_cast<const char*>(content.data()), content.size()), path);
+}
+
+ParamBlock ParseParams(std::string_view text, const std::string& fileName, const ParamBlock& base) {
+    return Applied(ParseParamSettings(text, fileName), base);
 }
 
 ParamBlock ReadParamFile(const std::string& path, const ParamBlock& base) {
-    const std::vector<uint8_t> content = ReadWholeFile(path);
-    return ParseParams(
-        std::string_view(reinterpret_cast<const char*>(content.data()), content.size()), path,
-        base);
+    return Applied(ReadParamSettings(path), base);
 }
 
 std::string ParamFileText(const ParamBlock& params) {

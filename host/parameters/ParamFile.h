@@ -7,14 +7,28 @@
 
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "parameters/ParamTable.h"
 
 namespace host {
 
+// One parameter that a file sets.
+struct ParamSetting {
+    size_t index = 0;  // in the block
+    int32_t value = 0;
+    std::string place;  // "line:column" of the value
+};
+
+// What a file sets, in no particular order. Error, with "line:column", for a file that is no TOML,
+// an unknown name, a value that is no integer or one outside the 32-bit range.
+std::vector<ParamSetting> ReadParamSettings(const std::string& path);
+
+// The same for text; fileName is what errors name.
+std::vector<ParamSetting> ParseParamSettings(std::string_view text, const std::string& fileName);
+
 // The parameters of a file over base: what the file does not mention keeps base's value.
-// Error, with "line:column", for a file that is no TOML, an unknown name, a value that is no
-// integer or one outside the 32-bit range.
+// Error as ReadParamSettings.
 ParamBlock ReadParamFile(const std::string& path, const ParamBlock& base = DefaultParams());
 
 // The same for text; fileName is what errors name.
