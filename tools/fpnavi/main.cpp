@@ -17,7 +17,7 @@ constexpr const char* kFooter = R"(Examples:
   fpnavi params --mode hg
   fpnavi tune --seed 1
 
-Exit codes: 0 fine, 1 wrong keys found, 2 usage, 3 bad input or output.
+Exit codes: 0 fine, 1 wrong keys or failed calls, 2 usage, 3 bad input or output.
 Recordings hold pictures of fingerprints: store and share them as biometric data.)";
 
 int Run(int argc, char** argv) {
