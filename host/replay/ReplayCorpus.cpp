@@ -74,8 +74,8 @@ void ReplayCorpus(const CorpusReplay& replay, const std::function<void(const Sto
     job.next = [&list] { return list.Next(); };
     job.openReader = [&replay] {
         const auto store = std::make_shared<Store>(Store::OpenForReading(replay.path));
-        return GestureReader([store, &replay](const GestureHead& head) {
-            Gesture gesture = store->Read(head);
+        return GestureReader([store, &replay](int64_t seq) {
+            Gesture gesture = store->ReadRow(seq);
             ApplyOverrides(replay.overrides, &gesture.params);
             return gesture;
         });

@@ -5,9 +5,10 @@
 // process it needs.
 //
 // Algorithm: the parent takes gestures from the list as long as fewer than a window of them lack a
-// result that has been given. Those of double scan wait in one queue, all others in another. A
-// process at work holds a small task; as soon as fewer than the limit are at work, the queue with
-// the foremost gesture gives the next task to an idle process of its kind, or to a new one.
+// result that has been given. Those of double scan wait in one queue, all others in another. Tasks
+// of a few gestures go out of the queue with the foremost gesture first, otherwise out of the other
+// one: to a process at work on its last task, so that none waits for the parent, or to an idle or
+// new one as long as fewer than the limit are at work.
 #include "replay/ReplayProcess.h"
 
 #include <fmt/core.h>
@@ -20,6 +21,7 @@
 #include <cerrno>
 #include <csignal>
 #include <cstring>
+#include <deque>
 #include <list>
 #include <map>
 #include <thread>
@@ -31,8 +33,8 @@
 namespace host {
 namespace {
 
-constexpr size_t kTaskMax = 16;     // gestures; fewer towards the end, so that all end together
-constexpr size_t kWindowPart = 64;  // gestures under way for each process
+constexpr size_t kTaskMax = 16;      // gestures; fewer towards the end, so that all end together
+constexpr size_t kWindowPart = 256;  // gestures under way for each process
 
 [[noreturn]] void Fail(const char* what, int reason) {
     throw Error("replay", "", fmt::format("{}: {}", what, std::strerror(reason)));
@@ -49,13 +51,12 @@ struct Worker {
     Worker(pid_t itsPid, int itsSocket, bool itsDoubleScan)
         : pid(itsPid), socket(itsSocket), doubleScan(itsDoubleScan), receiver(itsSocket) {}
 
-    bool AtWork() const { return done < task.size(); }
+    bool AtWork() const { return !items.empty(); }
 
     pid_t pid;
     int socket;
     bool doubleScan;
-    std::vector<Item> task;
-    size_t done = 0;  // of the task, answered
+    std::deque<Item> items;  // given and not yet answered
     wire::Receiver receiver;
 };
 
@@ -66,8 +67,19 @@ int Wait(pid_t pid) {
     return status;
 }
 
+// What is known of a gesture that was not replayed; verdict wrong.
+ReplayResult ResultOf(const GestureHead& head) {
+    ReplayResult result;
+    result.id = head.id;
+    result.mode = head.mode.value_or(Mode::Fp);
+    result.tier = head.tier;
+    result.label = head.label;
+    result.frameCount = head.frameCount;
+    return result;
+}
+
 ReplayResult Crashed(const GestureHead& head, int status) {
-    ReplayResult result = ResultOfHead(head);
+    ReplayResult result = ResultOf(head);
     result.errors.push_back(
         WIFSIGNALED(status)
             ? fmt::format("the process replaying it ended by signal {}", WTERMSIG(status))
@@ -96,7 +108,7 @@ class Pool {
     void Run() {
         for (;;) {
             TakeFromList();
-            while (AtWork() < m_limit && GiveTask()) {
+            while (GiveTask()) {
             }
             if (AtWork() == 0)
                 return;
@@ -110,8 +122,8 @@ class Pool {
             std::optional<GestureHead> head = m_job.next();
             m_listEnded = !head;
             if (head) {
-                Queue& queue = head->mode == Mode::DoubleScan ? m_doubleScan : m_others;
-                queue.emplace(m_listed++, std::move(*head));
+                QueueOf(head->mode == Mode::DoubleScan).emplace(m_listed, std::move(*head));
+                ++m_listed;
             }
         }
     }
@@ -121,36 +133,47 @@ class Pool {
                                                  [](const Worker& w) { return w.AtWork(); }));
     }
 
-    // Returns false when nothing waits.
+    // Returns false when nothing waits, or everyone has enough to do.
     bool GiveTask() {
-        if (m_doubleScan.empty() && m_others.empty())
-            return false;
-        const bool doubleScan =
+        const bool first =
             m_others.empty() ||
             (!m_doubleScan.empty() && m_doubleScan.begin()->first < m_others.begin()->first);
-        Queue& queue = doubleScan ? m_doubleScan : m_others;
-        Worker& worker = Idle(doubleScan);
-        worker.task.clear();
-        worker.done = 0;
-        std::vector<GestureHead> heads;
-        for (size_t left = std::clamp<size_t>(queue.size() / (2 * m_limit), 1, kTaskMax); left > 0;
+        return GiveTask(first) || GiveTask(!first);
+    }
+
+    bool GiveTask(bool doubleScan) {
+        Queue& queue = QueueOf(doubleScan);
+        Worker* const worker = queue.empty() ? nullptr : Taker(doubleScan);
+        if (worker == nullptr)
+            return false;
+        std::vector<int64_t> seqs;
+        for (size_t left = std::clamp<size_t>(queue.size() / (4 * m_limit), 1, kTaskMax); left > 0;
              --left) {
-            heads.push_back(queue.begin()->second);
-            worker.task.push_back({queue.begin()->first, std::move(queue.begin()->second)});
+            seqs.push_back(queue.begin()->second.seq);
+            worker->items.push_back({queue.begin()->first, std::move(queue.begin()->second)});
             queue.erase(queue.begin());
         }
         // A process that is gone shows as the end of its stream.
-        wire::Send(worker.socket, wire::Kind::Task, wire::EncodeTask(heads));
+        wire::Send(worker->socket, wire::Kind::Task, wire::EncodeTask(seqs));
         return true;
     }
 
-    Worker& Idle(bool doubleScan) {
+    // The process that is to take the next task of a kind; null: none now.
+    Worker* Taker(bool doubleScan) {
+        Worker* idle = nullptr;
+        Worker* onItsLast = nullptr;
         for (Worker& worker : m_workers) {
             if (worker.doubleScan == doubleScan && !worker.AtWork())
-                return worker;
+                idle = &worker;
+            else if (worker.doubleScan == doubleScan && worker.items.size() <= kTaskMax / 2)
+                onItsLast = &worker;
         }
-        return Start(doubleScan);
+        if (AtWork() >= m_limit)
+            return onItsLast;
+        return idle != nullptr ? idle : &Start(doubleScan);
     }
+
+    Queue& QueueOf(bool doubleScan) { return doubleScan ? m_doubleScan : m_others; }
 
     Worker& Start(bool doubleScan) {
         int ends[2];
@@ -203,8 +226,8 @@ class Pool {
                 wire::ThrowError(message->payload);
             if (!worker->AtWork())
                 throw Error("replay", "", "a replaying process answered more than it was asked");
-            const size_t index = worker->task[worker->done++].index;
-            Deliver(index, wire::Decode(message->payload));
+            Answered(worker->items.front(), wire::Decode(message->payload));
+            worker->items.pop_front();
         }
         return open;
     }
@@ -213,11 +236,19 @@ class Pool {
     void Finish(const Worker& worker, int status) {
         if (!worker.AtWork())
             return;
-        Queue& queue = worker.doubleScan ? m_doubleScan : m_others;
-        for (size_t k = worker.done + 1; k < worker.task.size(); ++k)
-            queue.emplace(worker.task[k].index, worker.task[k].head);
-        const Item& item = worker.task[worker.done];
-        Deliver(item.index, Crashed(item.head, status));
+        for (size_t k = 1; k < worker.items.size(); ++k)
+            QueueOf(worker.doubleScan).emplace(worker.items[k].index, worker.items[k].head);
+        Deliver(worker.items[0].index, Crashed(worker.items[0].head, status));
+    }
+
+    void Answered(const Item& item, ReplayResult result) {
+        if (result.verdict == Verdict::Unreadable) {
+            ReplayResult known = ResultOf(item.head);
+            known.verdict = result.verdict;
+            known.errors = std::move(result.errors);
+            result = std::move(known);
+        }
+        Deliver(item.index, std::move(result));
     }
 
     // Keeps results until all before them have come.
@@ -246,31 +277,6 @@ class Pool {
 
 void ReplayMany(const ReplayJob& job, const ResultSink& sink) {
     Pool(job, sink).Run();
-}
-
-std::vector<ReplayResult> ReplayAll(const std::vector<Gesture>& gestures, int32_t processes) {
-    ReplayJob job;
-    job.processes = processes;
-    job.next = [&gestures, index = size_t{0}]() mutable -> std::optional<GestureHead> {
-        if (index == gestures.size())
-            return std::nullopt;
-        const Gesture& gesture = gestures[index];
-        GestureHead head = {static_cast<int64_t>(index++),
-                            gesture.id,
-                            gesture.mode,
-                            gesture.label,
-                            gesture.tier,
-                            static_cast<int32_t>(gesture.frames.size())};
-        return head;
-    };
-    job.openReader = [&gestures] {
-        return GestureReader([&gestures](const GestureHead& head) {
-            return gestures[static_cast<size_t>(head.seq)];
-        });
-    };
-    std::vector<ReplayResult> results;
-    ReplayMany(job, [&results](size_t, const ReplayResult& result) { results.push_back(result); });
-    return results;
 }
 
 }  // namespace host

@@ -13,8 +13,8 @@
 
 namespace host {
 
-// Gives the gesture of a head.
-using GestureReader = std::function<Gesture(const GestureHead& head)>;
+// Gives the gesture of a head's seq.
+using GestureReader = std::function<Gesture(int64_t seq)>;
 
 struct ReplayJob {
     std::string source = "replay";  // what errors name as the file of the gestures
@@ -30,7 +30,7 @@ using ResultSink = std::function<void(size_t index, const ReplayResult& result)>
 
 // Replays the gestures and gives each result to sink as soon as it and all before it are there; the
 // results carry no calls of single frames. Each gesture is read once, and the gestures and results
-// in memory are at most 64 for each of the processes. A gesture that the reader or ReplayHere
+// in memory are at most 256 for each of the processes. A gesture that the reader or ReplayHere
 // throws for is unreadable, with what they say as its error. A child that crashes is replaced: the
 // gesture it was at is wrong, with the crash as its error. Throws Error for an exception of
 // openReader, and when no process can be started, and what next and sink throw; all children have

@@ -29,25 +29,12 @@ void PutText(std::string* out, const std::string& text) {
     out->append(text);
 }
 
-template <typename T>
-void PutOptional(std::string* out, const std::optional<T>& value) {
-    PutInt(out, value ? 1 : 0);
-    PutInt(out, value ? static_cast<int32_t>(*value) : 0);
-}
-
 class Parser {
   public:
     explicit Parser(std::string_view bytes) : m_bytes(bytes) {}
 
     int32_t Int() { return Number<int32_t>(); }
     int64_t Long() { return Number<int64_t>(); }
-
-    template <typename T>
-    std::optional<T> Optional() {
-        const bool present = Int() != 0;
-        const auto value = static_cast<T>(Int());
-        return present ? std::optional<T>(value) : std::nullopt;
-    }
 
     std::string Text() {
         const int32_t size = Int();
@@ -84,7 +71,10 @@ ReplayResult Decode(const std::string& payload) {
     result.id = in.Text();
     result.mode = static_cast<Mode>(in.Int());
     result.tier = in.Text();
-    result.label = in.Optional<int32_t>();
+    const bool labelled = in.Int() != 0;
+    const int32_t label = in.Int();
+    if (labelled)
+        result.label = label;
     result.frameCount = in.Int();
     result.key = in.Int();
     result.pairs = in.Int();
@@ -100,7 +90,8 @@ std::string Encode(const ReplayResult& result) {
     PutText(&out, result.id);
     PutInt(&out, static_cast<int32_t>(result.mode));
     PutText(&out, result.tier);
-    PutOptional(&out, result.label);
+    PutInt(&out, result.label ? 1 : 0);
+    PutInt(&out, result.label.value_or(0));
     PutInt(&out, result.frameCount);
     PutInt(&out, result.key);
     PutInt(&out, result.pairs);
@@ -112,34 +103,20 @@ std::string Encode(const ReplayResult& result) {
     return out;
 }
 
-std::string EncodeTask(const std::vector<GestureHead>& heads) {
+std::string EncodeTask(const std::vector<int64_t>& seqs) {
     std::string out;
-    PutInt(&out, static_cast<int32_t>(heads.size()));
-    for (const GestureHead& head : heads) {
-        PutLong(&out, head.seq);
-        PutText(&out, head.id);
-        PutOptional(&out, head.mode);
-        PutOptional(&out, head.label);
-        PutText(&out, head.tier);
-        PutInt(&out, head.frameCount);
-    }
+    PutInt(&out, static_cast<int32_t>(seqs.size()));
+    for (const int64_t seq : seqs)
+        PutLong(&out, seq);
     return out;
 }
 
-std::vector<GestureHead> DecodeTask(const std::string& payload) {
+std::vector<int64_t> DecodeTask(const std::string& payload) {
     Parser in(payload);
-    std::vector<GestureHead> heads;
-    for (int32_t left = in.Int(); left > 0; --left) {
-        GestureHead head;
-        head.seq = in.Long();
-        head.id = in.Text();
-        head.mode = in.Optional<Mode>();
-        head.label = in.Optional<int32_t>();
-        head.tier = in.Text();
-        head.frameCount = in.Int();
-        heads.push_back(std::move(head));
-    }
-    return heads;
+    std::vector<int64_t> seqs;
+    for (int32_t left = in.Int(); left > 0; --left)
+        seqs.push_back(in.Long());
+    return seqs;
 }
 
 std::string EncodeError(const std::string& file, const std::string& what) {

@@ -3,12 +3,12 @@
 #ifndef FPNAVI_HOST_REPLAYWIRE_H
 #define FPNAVI_HOST_REPLAYWIRE_H
 
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <vector>
 
 #include "replay/Replay.h"
-#include "store/Store.h"
 
 namespace host::wire {
 
@@ -28,9 +28,9 @@ struct Message {
 std::string Encode(const ReplayResult& result);
 ReplayResult Decode(const std::string& payload);
 
-// The heads of a task's gestures, and back.
-std::string EncodeTask(const std::vector<GestureHead>& heads);
-std::vector<GestureHead> DecodeTask(const std::string& payload);
+// The seqs of a task's gestures, and back.
+std::string EncodeTask(const std::vector<int64_t>& seqs);
+std::vector<int64_t> DecodeTask(const std::string& payload);
 
 // What an Error of the child says, and the same thrown again in the parent.
 std::string EncodeError(const std::string& file, const std::string& what);

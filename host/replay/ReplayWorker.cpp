@@ -16,14 +16,13 @@ void CheckMode(const Gesture& gesture, bool doubleScan, const std::string& sourc
                     "changed its mode to " + ModeName(gesture.mode) + " during the replay");
 }
 
-ReplayResult Answer(const ReplayJob& job, const GestureReader& read, const GestureHead& head,
-                    bool doubleScan) {
+ReplayResult Answer(const ReplayJob& job, const GestureReader& read, int64_t seq, bool doubleScan) {
     try {
-        const Gesture gesture = read(head);
+        const Gesture gesture = read(seq);
         CheckMode(gesture, doubleScan, job.source);
         return ReplayHere(gesture, {}, job.source);
     } catch (const std::exception& error) {
-        ReplayResult result = ResultOfHead(head);
+        ReplayResult result;  // the parent knows the rest from the list
         result.verdict = Verdict::Unreadable;
         result.errors.emplace_back(error.what());
         return result;
@@ -35,8 +34,8 @@ bool Serve(const ReplayJob& job, bool doubleScan, int socket) {
     const GestureReader read = job.openReader();
     wire::Receiver receiver(socket);
     while (const std::optional<wire::Message> task = receiver.Next()) {
-        for (const GestureHead& head : wire::DecodeTask(task->payload)) {
-            const ReplayResult result = Answer(job, read, head, doubleScan);
+        for (const int64_t seq : wire::DecodeTask(task->payload)) {
+            const ReplayResult result = Answer(job, read, seq, doubleScan);
             if (!wire::Send(socket, wire::Kind::Result, wire::Encode(result)))
                 return false;
         }
@@ -45,16 +44,6 @@ bool Serve(const ReplayJob& job, bool doubleScan, int socket) {
 }
 
 }  // namespace
-
-ReplayResult ResultOfHead(const GestureHead& head) {
-    ReplayResult result;
-    result.id = head.id;
-    result.mode = head.mode.value_or(Mode::Fp);
-    result.tier = head.tier;
-    result.label = head.label;
-    result.frameCount = head.frameCount;
-    return result;
-}
 
 void RunWorker(const ReplayJob& job, bool doubleScan, int socket) {
     bool done = false;

@@ -6,9 +6,6 @@
 
 namespace host {
 
-// What is known of a gesture that was not replayed; verdict wrong.
-ReplayResult ResultOfHead(const GestureHead& head);
-
 // The child's life: answers the tasks that come through socket until the parent closes it. With
 // doubleScan it takes gestures of that mode only, without it all others. Never returns.
 [[noreturn]] void RunWorker(const ReplayJob& job, bool doubleScan, int socket);

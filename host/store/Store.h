@@ -100,8 +100,8 @@ class Store {
     // The gesture called id; Error when there is none or its rows are not sound.
     Gesture Read(const std::string& id) const;
 
-    // The same for the gesture of a head.
-    Gesture Read(const GestureHead& head) const;
+    // The same for the seq of a head.
+    Gesture ReadRow(int64_t seq) const;
 
     // Calls visit with each gesture in the order of appending, one in memory at a time. What visit
     // throws ends it.

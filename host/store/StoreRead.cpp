@@ -158,14 +158,13 @@ class StoreReader {
           m_frames(database, kReadFrames, "read the frames") {}
 
     template <typename Key>
-    Gesture Read(const Key& key, const std::string& id) {
+    Gesture Read(const Key& key, const std::string& place) {
         Statement& row = ByKey(key);
         const ResetAtEnd reset(row);
-        row.At(GesturePlace(id));
+        row.At(place);
         row.Bind(1, key);
         if (!row.Step())
-            throw Error(m_database.Path(), GesturePlace(id),
-                        "is not in the store, expected one of its ids");
+            throw Error(m_database.Path(), place, "is not in the store, expected one of its ids");
         return FromRow(row);
     }
 
@@ -258,11 +257,11 @@ StoreReader& Store::Reader() const {
 }
 
 Gesture Store::Read(const std::string& id) const {
-    return Reader().Read(id, id);
+    return Reader().Read(id, GesturePlace(id));
 }
 
-Gesture Store::Read(const GestureHead& head) const {
-    return Reader().Read(head.seq, head.id);
+Gesture Store::ReadRow(int64_t seq) const {
+    return Reader().Read(seq, fmt::format("gesture row {}", seq));
 }
 
 void Store::ForEach(const std::function<void(const Gesture&)>& visit) const {
