@@ -19,21 +19,6 @@ namespace {
     throw Error(source, "gesture '" + gesture.id + "'", problem);
 }
 
-// The hg finger test reads s_imageWidthHg x s_imageHeightHg bytes of the frame, whatever the
-// frame's own size, and trusts the host that they are there.
-void CheckFingerTestSize(const Gesture& gesture, const std::string& source) {
-    if (gesture.mode != Mode::Hg)
-        return;
-    const int64_t size = gesture.geometry.Width() * gesture.geometry.Height();
-    const int64_t width = ParamValue(gesture.params, "s_imageWidthHg");
-    const int64_t height = ParamValue(gesture.params, "s_imageHeightHg");
-    if (width >= 1 && height >= 1 && width * height > size)
-        Refuse(gesture, source,
-               fmt::format("s_imageWidthHg x s_imageHeightHg is {} pixels, but a frame "
-                           "has {}",
-                           width * height, size));
-}
-
 class Loop {
   public:
     Loop(const Gesture& gesture, const ReplayHooks& hooks)
@@ -103,10 +88,27 @@ class Loop {
 
 }  // namespace
 
+// The hg finger test reads s_imageWidthHg x s_imageHeightHg bytes of the frame, whatever the
+// frame's own size, and trusts the host that they are there.
+std::string FingerTestProblem(const ParamBlock& params) {
+    if (ModeOf(params) != Mode::Hg)
+        return "";
+    const Geometry g = GeometryOf(params);  // of any values: no integer holds all products
+    const double size = double{1} * g.blockWidth * g.blockColNum * g.blockHeight * g.blockRowNum;
+    const int64_t width = ParamValue(params, "s_imageWidthHg");
+    const int64_t height = ParamValue(params, "s_imageHeightHg");
+    if (width < 1 || height < 1 || static_cast<double>(width * height) <= size)
+        return "";
+    return fmt::format("s_imageWidthHg x s_imageHeightHg is {} pixels, but a frame has {:.0f}",
+                       width * height, size);
+}
+
 ReplayResult ReplayHere(const Gesture& gesture, const ReplayHooks& hooks,
                         const std::string& source) {
     CheckGesture(gesture, source);
-    CheckFingerTestSize(gesture, source);
+    const std::string problem = FingerTestProblem(gesture.params);
+    if (!problem.empty())
+        Refuse(gesture, source, problem);
     if (fpnavi::ScansTwice() && gesture.mode != Mode::DoubleScan)
         Refuse(gesture, source,
                fmt::format("this process has switched the double scan on; a gesture of "
@@ -131,10 +133,15 @@ ReplayResult EmptyResult(const Gesture& gesture) {
 
 Verdict JudgeKey(int32_t key, const std::optional<int32_t>& label,
                  const std::vector<int32_t>& accepted) {
+    const auto lists = [&accepted](int32_t one) {
+        return std::find(accepted.begin(), accepted.end(), one) != accepted.end();
+    };
     if (label && key == *label)
         return Verdict::Right;
-    const bool found = std::find(accepted.begin(), accepted.end(), key) != accepted.end();
-    return found ? Verdict::Accepted : Verdict::Wrong;
+    if (!label && accepted.empty())
+        return Verdict::Unknown;
+    const bool valid = !label || lists(*label);
+    return valid && lists(key) ? Verdict::Accepted : Verdict::Wrong;
 }
 
 const char* VerdictName(Verdict verdict) {
@@ -143,8 +150,12 @@ const char* VerdictName(Verdict verdict) {
             return "right";
         case Verdict::Accepted:
             return "accepted";
-        default:
+        case Verdict::Wrong:
             return "wrong";
+        case Verdict::Unknown:
+            return "unknown";
+        default:
+            return "unreadable";
     }
 }
 

@@ -23,10 +23,14 @@ struct FrameCalls {
 };
 
 enum class Verdict : int32_t {
-    Right = 0,     // the label
-    Accepted = 1,  // not the label, but no error either
-    Wrong = 2,     // any other key, or a call failed
+    Right = 0,       // the label
+    Accepted = 1,    // not the label, but no error either
+    Wrong = 2,       // any other key, or a call failed
+    Unknown = 3,     // nobody knows which key is right
+    Unreadable = 4,  // the gesture could not be read, or not be given to the module
 };
+
+inline constexpr size_t kVerdictCount = 5;
 
 struct ReplayResult {
     std::string id;
@@ -57,14 +61,19 @@ struct ReplayHooks {
 ReplayResult ReplayHere(const Gesture& gesture, const ReplayHooks& hooks = {},
                         const std::string& source = "replay");
 
+// What is wrong with the size of the hg finger test that params give; empty if nothing is.
+std::string FingerTestProblem(const ParamBlock& params);
+
 // What a result says of the gesture itself; no key, verdict wrong.
 ReplayResult EmptyResult(const Gesture& gesture);
 
-// Verdict on a key without failed calls.
+// Verdict on a key without failed calls: the one place where label and accepted keys get their
+// meaning. accepted are the keys that are no error, a label among them; an accepted list without
+// the label was made for another label, and does not count. Without both nothing is known.
 Verdict JudgeKey(int32_t key, const std::optional<int32_t>& label,
                  const std::vector<int32_t>& accepted);
 
-// "right", "accepted", "wrong".
+// "right", "accepted", "wrong", "unknown", "unreadable".
 const char* VerdictName(Verdict verdict);
 
 }  // namespace host

@@ -4,30 +4,37 @@
 #define FPNAVI_HOST_REPLAYPROCESS_H
 
 #include <functional>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "replay/Replay.h"
+#include "store/Store.h"
 
 namespace host {
 
-// Gives the gesture at an index of the ids.
-using GestureReader = std::function<Gesture(size_t index)>;
+// Gives the gesture of a head's seq.
+using GestureReader = std::function<Gesture(int64_t seq)>;
 
 struct ReplayJob {
     std::string source = "replay";  // what errors name as the file of the gestures
-    std::vector<std::string> ids;
+    // The gestures one after the other; empty at the end. Called in the parent, which forks: it
+    // must leave no file open.
+    std::function<std::optional<GestureHead>()> next;
     // Called once in each child process; what it opens is the child's own.
     std::function<GestureReader()> openReader;
-    int32_t processes = 0;  // at once; 0: one for each processor
+    int32_t processes = 0;  // at work at once; 0: one for each processor
 };
 
 using ResultSink = std::function<void(size_t index, const ReplayResult& result)>;
 
-// Replays the gestures and gives each result to sink, in the order of the ids; the results carry no
-// calls of single frames. A child that crashes is replaced: the gesture it was at is wrong, with
-// the crash as its error. Throws Error for an exception of a reader or of ReplayHere, and when no
-// process can be started; all children have ended then.
+// Replays the gestures and gives each result to sink as soon as it and all before it are there; the
+// results carry no calls of single frames. Each gesture is read once, and the gestures and results
+// in memory are at most 256 for each of the processes. A gesture that the reader or ReplayHere
+// throws for is unreadable, with what they say as its error. A child that crashes is replaced: the
+// gesture it was at is wrong, with the crash as its error. Throws Error for an exception of
+// openReader, and when no process can be started, and what next and sink throw; all children have
+// ended then.
 void ReplayMany(const ReplayJob& job, const ResultSink& sink);
 
 // The same for gestures in memory.

@@ -1,6 +1,6 @@
 #include "replay/ReplayWire.h"
 
-#include <unistd.h>
+#include <sys/socket.h>
 
 #include <cerrno>
 #include <cstring>
@@ -18,6 +18,12 @@ void PutInt(std::string* out, int32_t value) {
     out->append(bytes, sizeof bytes);
 }
 
+void PutLong(std::string* out, int64_t value) {
+    char bytes[sizeof value];
+    std::memcpy(bytes, &value, sizeof value);
+    out->append(bytes, sizeof bytes);
+}
+
 void PutText(std::string* out, const std::string& text) {
     PutInt(out, static_cast<int32_t>(text.size()));
     out->append(text);
@@ -27,12 +33,8 @@ class Parser {
   public:
     explicit Parser(std::string_view bytes) : m_bytes(bytes) {}
 
-    int32_t Int() {
-        int32_t value = 0;
-        const std::string_view bytes = Bytes(sizeof value);
-        std::memcpy(&value, bytes.data(), sizeof value);
-        return value;
-    }
+    int32_t Int() { return Number<int32_t>(); }
+    int64_t Long() { return Number<int64_t>(); }
 
     std::string Text() {
         const int32_t size = Int();
@@ -42,6 +44,14 @@ class Parser {
     }
 
   private:
+    template <typename T>
+    T Number() {
+        T value = 0;
+        const std::string_view bytes = Bytes(sizeof value);
+        std::memcpy(&value, bytes.data(), sizeof value);
+        return value;
+    }
+
     std::string_view Bytes(size_t size) {
         if (size > m_bytes.size())
             throw Error("replay", "", "a replaying process sent a damaged message");
@@ -93,6 +103,22 @@ std::string Encode(const ReplayResult& result) {
     return out;
 }
 
+std::string EncodeTask(const std::vector<int64_t>& seqs) {
+    std::string out;
+    PutInt(&out, static_cast<int32_t>(seqs.size()));
+    for (const int64_t seq : seqs)
+        PutLong(&out, seq);
+    return out;
+}
+
+std::vector<int64_t> DecodeTask(const std::string& payload) {
+    Parser in(payload);
+    std::vector<int64_t> seqs;
+    for (int32_t left = in.Int(); left > 0; --left)
+        seqs.push_back(in.Long());
+    return seqs;
+}
+
 std::string EncodeError(const std::string& file, const std::string& what) {
     const std::string start = file + ": ";  // which the parent's Error will put there again
     std::string out;
@@ -107,13 +133,14 @@ void ThrowError(const std::string& payload) {
     throw Error(file, "", in.Text());
 }
 
-bool Send(int pipe, Kind kind, const std::string& payload) {
+bool Send(int socket, Kind kind, const std::string& payload) {
     std::string message;
     PutInt(&message, static_cast<int32_t>(kind));
     PutText(&message, payload);
     size_t sent = 0;
     while (sent < message.size()) {
-        const ssize_t count = write(pipe, message.data() + sent, message.size() - sent);
+        const ssize_t count =
+            send(socket, message.data() + sent, message.size() - sent, MSG_NOSIGNAL);
         if (count < 0 && errno == EINTR)
             continue;
         if (count <= 0)
@@ -123,22 +150,39 @@ bool Send(int pipe, Kind kind, const std::string& payload) {
     return true;
 }
 
-bool Take(std::string* received, Message* message) {
-    if (received->size() < kHeadSize)
-        return false;
-    Parser head(std::string_view(*received).substr(0, kHeadSize));
+std::optional<Message> Receiver::Next() {
+    std::optional<Message> message = Take();
+    while (!message && Fill())
+        message = Take();
+    return message;
+}
+
+bool Receiver::Fill() {
+    char buffer[16384];
+    const ssize_t count = recv(m_socket, buffer, sizeof buffer, 0);
+    if (count < 0)
+        return errno == EINTR;
+    m_received.append(buffer, static_cast<size_t>(count));
+    return count > 0;
+}
+
+std::optional<Message> Receiver::Take() {
+    if (m_received.size() < kHeadSize)
+        return std::nullopt;
+    Parser head(std::string_view(m_received).substr(0, kHeadSize));
+    Message message;
     const int32_t kind = head.Int();
     const int32_t size = head.Int();
-    if (kind < static_cast<int32_t>(Kind::Begun) || kind > static_cast<int32_t>(Kind::Error) ||
+    if (kind < static_cast<int32_t>(Kind::Task) || kind > static_cast<int32_t>(Kind::Error) ||
         size < 0)
         throw Error("replay", "", "a replaying process sent a damaged message");
     const size_t end = kHeadSize + static_cast<size_t>(size);
-    if (received->size() < end)
-        return false;
-    message->kind = static_cast<Kind>(kind);
-    message->payload = received->substr(kHeadSize, static_cast<size_t>(size));
-    received->erase(0, end);
-    return true;
+    if (m_received.size() < end)
+        return std::nullopt;
+    message.kind = static_cast<Kind>(kind);
+    message.payload = m_received.substr(kHeadSize, static_cast<size_t>(size));
+    m_received.erase(0, end);
+    return message;
 }
 
 }  // namespace host::wire

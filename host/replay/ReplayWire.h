@@ -1,19 +1,21 @@
-// How a replaying child process hands results to its parent: messages of a length and as many
-// bytes, integers in the machine's own order, as both ends are the same program.
+// What a parent and its replaying child processes send each other through a socket: messages of a
+// length and as many bytes, integers in the machine's own order, as both ends are the same program.
 #ifndef FPNAVI_HOST_REPLAYWIRE_H
 #define FPNAVI_HOST_REPLAYWIRE_H
 
+#include <cstdint>
+#include <optional>
 #include <string>
+#include <vector>
 
 #include "replay/Replay.h"
 
 namespace host::wire {
 
 enum class Kind : int32_t {
-    Begun = 1,       // a result that says which gesture comes next
-    Result = 2,      // its result
-    HandedBack = 3,  // no payload: the next gesture needs a process with double scan
-    Error = 4,       // why the child gives up
+    Task = 1,    // to the child: gestures to replay, in this order
+    Result = 2,  // to the parent: the result of the next one of them
+    Error = 3,   // to the parent: why the child gives up
 };
 
 struct Message {
@@ -26,16 +28,36 @@ struct Message {
 std::string Encode(const ReplayResult& result);
 ReplayResult Decode(const std::string& payload);
 
+// The seqs of a task's gestures, and back.
+std::string EncodeTask(const std::vector<int64_t>& seqs);
+std::vector<int64_t> DecodeTask(const std::string& payload);
+
 // What an Error of the child says, and the same thrown again in the parent.
 std::string EncodeError(const std::string& file, const std::string& what);
 [[noreturn]] void ThrowError(const std::string& payload);
 
-// Writes one message to a pipe. Returns false when the reader is gone or writing failed.
-bool Send(int pipe, Kind kind, const std::string& payload);
+// Sends one message. Returns false when the reader is gone or sending failed.
+bool Send(int socket, Kind kind, const std::string& payload);
 
-// Takes the first whole message off the front of received. Returns false when there is none yet;
-// throws Error for a message that Send did not write.
-bool Take(std::string* received, Message* message);
+// Takes messages from a socket.
+class Receiver {
+  public:
+    explicit Receiver(int socket) : m_socket(socket) {}
+
+    // Waits for a whole message; empty at the end of the stream. Throws Error for a message that
+    // Send did not write.
+    std::optional<Message> Next();
+
+    // Reads what is there, waiting if there is nothing. Returns false at the end of the stream.
+    bool Fill();
+
+    // The next whole message among what has been read; empty when there is none. Throws as Next.
+    std::optional<Message> Take();
+
+  private:
+    int m_socket;
+    std::string m_received;  // not yet taken
+};
 
 }  // namespace host::wire
 

@@ -7,6 +7,7 @@
 
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -15,7 +16,24 @@
 namespace host {
 
 class Database;
+class StoreReader;
 class Transaction;
+
+// What a list of a store shows of a gesture, its frames not read. What is not sound in its row is
+// empty here; reading the gesture says what is wrong.
+struct GestureHead {
+    int64_t seq = 0;  // in the order of appending
+    std::string id;
+    std::optional<Mode> mode;
+    std::optional<int32_t> label;
+    std::string tier;
+    int32_t frameCount = 0;
+};
+
+struct StoreExtent {
+    int64_t count = 0;      // gestures
+    int64_t longestId = 0;  // bytes
+};
 
 // One open store. Every member function throws Error with the file's name; an Append that throws
 // leaves the store as it was. Use one Store from one thread; several processes may open the same
@@ -62,13 +80,28 @@ class Store {
 
     int64_t Count() const;
 
-    // In the order of appending; Error when the index of the ids has another number.
+    // Error when the index of the ids has another number of gestures.
+    StoreExtent Extent() const;
+
+    // In the order of appending; Error as Extent.
     std::vector<std::string> Ids() const;
+
+    // At most limit gestures in the order of appending, of those with seq above after. What is
+    // asked for first comes after INT64_MIN.
+    std::vector<GestureHead> Heads(int64_t after, int64_t limit) const;
+
+    // Calls visit with each parameter block and the id of a gesture that has it. Leaves out blocks
+    // that are not sound; reading their gestures says what is wrong.
+    void ForEachParams(
+        const std::function<void(const ParamBlock& params, const std::string& id)>& visit) const;
 
     bool Contains(const std::string& id) const;
 
     // The gesture called id; Error when there is none or its rows are not sound.
     Gesture Read(const std::string& id) const;
+
+    // The same for the seq of a head.
+    Gesture ReadRow(int64_t seq) const;
 
     // Calls visit with each gesture in the order of appending, one in memory at a time. What visit
     // throws ends it.
@@ -80,7 +113,10 @@ class Store {
     Store(std::unique_ptr<Database> database, bool appending);
     void Close() noexcept;
 
+    StoreReader& Reader() const;
+
     std::unique_ptr<Database> m_database;
+    mutable std::unique_ptr<StoreReader> m_reader;  // made by the first reading
     bool m_appending = false;
 };
 

@@ -3,6 +3,7 @@
 
 #include <limits>
 #include <nlohmann/json.hpp>
+#include <unordered_map>
 
 #include "common/Error.h"
 #include "recording/Keys.h"
@@ -27,7 +28,9 @@ constexpr int64_t kUint32Max = std::numeric_limits<uint32_t>::max();
 
 constexpr const char* kReadOne = FPNAVI_GESTURE_COLUMNS("g.checksum") "WHERE g.id = ?";
 constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS("g.checksum") "ORDER BY g.seq";
+constexpr const char* kReadRow = FPNAVI_GESTURE_COLUMNS("g.checksum") "WHERE g.seq = ?";
 constexpr const char* kReadOneOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "WHERE g.id = ?";
+constexpr const char* kReadRowOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "WHERE g.seq = ?";
 constexpr const char* kReadAllOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "ORDER BY g.seq";
 #undef FPNAVI_GESTURE_COLUMNS
 
@@ -97,8 +100,20 @@ RecordedFrame FrameFromRow(const Statement& row) {
     return frame;
 }
 
-void ReadFrames(const Database& database, int64_t seq, int64_t count, Gesture& gesture) {
-    Statement row(database, kReadFrames, "read the frames");
+// A statement that is not at its end keeps the file locked.
+class ResetAtEnd {
+  public:
+    explicit ResetAtEnd(Statement& statement) : m_statement(statement) {}
+    ~ResetAtEnd() { m_statement.Reset(); }
+    ResetAtEnd(const ResetAtEnd&) = delete;
+    ResetAtEnd& operator=(const ResetAtEnd&) = delete;
+
+  private:
+    Statement& m_statement;
+};
+
+void ReadFrames(Statement& row, int64_t seq, int64_t count, Gesture& gesture) {
+    const ResetAtEnd reset(row);
     const std::string place = GesturePlace(gesture.id);
     row.Bind(1, seq);
     row.At(place);
@@ -117,23 +132,6 @@ void ReadFrames(const Database& database, int64_t seq, int64_t count, Gesture& g
     }
 }
 
-// Both numbers in one statement, so that no other process can append between them.
-constexpr const char* kCountTwice =
-    "SELECT (SELECT count(*) FROM gesture NOT INDEXED), "
-    "(SELECT count(*) FROM gesture INDEXED BY sqlite_autoindex_gesture_1)";
-
-// A damaged page can take rows with it; the index of the ids then still has them.
-void CheckNoneIsMissing(const Database& database) {
-    Statement row(database, kCountTwice, "count the gestures");
-    row.Step();
-    const int64_t rows = row.Integer(0, 0, INT64_MAX);
-    const int64_t ids = row.Integer(1, 0, INT64_MAX);
-    if (rows != ids)
-        throw Error(
-            database.Path(), "table gesture",
-            fmt::format("{} rows, expected {} as its index has: the file is damaged", rows, ids));
-}
-
 void CheckChecksum(const Statement& row, int column, const Gesture& gesture) {
     if (row.IsNull(column))
         return;
@@ -146,28 +144,82 @@ void CheckChecksum(const Statement& row, int column, const Gesture& gesture) {
                         computed, stored));
 }
 
-Gesture GestureFromRow(const Database& database, Statement& row) {
-    Gesture gesture;
-    row.At(fmt::format("gesture row {}", row.Integer(0, INT64_MIN, INT64_MAX)));
-    gesture.id = row.Text(1);
-    const std::string place = GesturePlace(gesture.id);
-    row.At(place);
-    gesture.params = ParamsFromJson(row.Text(2), database.Path(), place);
-    ReadNames(row, gesture);
-    gesture.geometry = {BlockSide(row, 4), BlockSide(row, 5), BlockSide(row, 6), BlockSide(row, 7)};
-    gesture.tier = row.Text(12);
-    gesture.tags = TextList(row, 13, "tags");
-    gesture.libraryVersion = row.Text(14);
-    gesture.notes = row.Text(15);
-    ReadFrames(database, row.Integer(0, INT64_MIN, INT64_MAX), row.Integer(8, 0, kInt32Max),
-               gesture);
-    CheckGesture(gesture, database.Path());
-    row.At(place);
-    CheckChecksum(row, 16, gesture);
-    return gesture;
-}
-
 }  // namespace
+
+// What reading one gesture after the other needs again: prepared statements, and the parameter
+// blocks that were read, by their text.
+class StoreReader {
+  public:
+    explicit StoreReader(const Database& database)
+        : m_database(database),
+          m_sums(StoreVersion(database) > kStoreSchemaWithoutChecksums),
+          m_byId(database, m_sums ? kReadOne : kReadOneOfVersion1, "read the gesture"),
+          m_bySeq(database, m_sums ? kReadRow : kReadRowOfVersion1, "read the gesture"),
+          m_frames(database, kReadFrames, "read the frames") {}
+
+    template <typename Key>
+    Gesture Read(const Key& key, const std::string& place) {
+        Statement& row = ByKey(key);
+        const ResetAtEnd reset(row);
+        row.At(place);
+        row.Bind(1, key);
+        if (!row.Step())
+            throw Error(m_database.Path(), place, "is not in the store, expected one of its ids");
+        return FromRow(row);
+    }
+
+    void ReadAll(const std::function<void(const Gesture&)>& visit) {
+        Statement row(m_database, m_sums ? kReadAll : kReadAllOfVersion1, "read the gestures");
+        while (row.Step()) {
+            visit(FromRow(row));
+            row.At("");
+        }
+    }
+
+  private:
+    Statement& ByKey(const std::string& /*id*/) { return m_byId; }
+    Statement& ByKey(int64_t /*seq*/) { return m_bySeq; }
+
+    const ParamBlock& Params(const std::string& text, const std::string& place) {
+        auto found = m_params.find(text);
+        if (found == m_params.end()) {
+            if (m_params.size() >= kParamsMax)
+                m_params.clear();
+            found = m_params.emplace(text, ParamsFromJson(text, m_database.Path(), place)).first;
+        }
+        return found->second;
+    }
+
+    Gesture FromRow(Statement& row) {
+        Gesture gesture;
+        row.At(fmt::format("gesture row {}", row.Integer(0, INT64_MIN, INT64_MAX)));
+        gesture.id = row.Text(1);
+        const std::string place = GesturePlace(gesture.id);
+        row.At(place);
+        gesture.params = Params(row.Text(2), place);
+        ReadNames(row, gesture);
+        gesture.geometry = {BlockSide(row, 4), BlockSide(row, 5), BlockSide(row, 6),
+                            BlockSide(row, 7)};
+        gesture.tier = row.Text(12);
+        gesture.tags = TextList(row, 13, "tags");
+        gesture.libraryVersion = row.Text(14);
+        gesture.notes = row.Text(15);
+        ReadFrames(m_frames, row.Integer(0, INT64_MIN, INT64_MAX), row.Integer(8, 0, kInt32Max),
+                   gesture);
+        CheckGesture(gesture, m_database.Path());
+        CheckChecksum(row, 16, gesture);
+        return gesture;
+    }
+
+    static constexpr size_t kParamsMax = 256;  // some 3 KB each
+
+    const Database& m_database;
+    bool m_sums;
+    Statement m_byId;
+    Statement m_bySeq;
+    Statement m_frames;
+    std::unordered_map<std::string, ParamBlock> m_params;
+};
 
 Store::Store(std::unique_ptr<Database> database, bool appending)
     : m_database(std::move(database)), m_appending(appending) {}
@@ -176,14 +228,17 @@ Store::Store(Store&& other) noexcept = default;
 
 Store& Store::operator=(Store&& other) noexcept {
     if (this != &other) {
+        m_reader.reset();  // its statements end before their connection
         Close();
         m_database = std::move(other.m_database);
+        m_reader = std::move(other.m_reader);
         m_appending = other.m_appending;
     }
     return *this;
 }
 
 Store::~Store() {
+    m_reader.reset();
     Close();
 }
 
@@ -195,43 +250,23 @@ const std::string& Store::Path() const {
     return m_database->Path();
 }
 
-int64_t Store::Count() const {
-    return m_database->Number("SELECT count(*) FROM gesture", "count the gestures");
-}
-
-std::vector<std::string> Store::Ids() const {
-    CheckNoneIsMissing(*m_database);
-    Statement row(*m_database, "SELECT id FROM gesture ORDER BY seq", "list the gestures");
-    std::vector<std::string> ids;
-    while (row.Step())
-        ids.push_back(row.Text(0));
-    return ids;
-}
-
-bool Store::Contains(const std::string& id) const {
-    Statement row(*m_database, "SELECT 1 FROM gesture WHERE id = ?", "look for a gesture");
-    row.Bind(1, id);
-    return row.Step();
+StoreReader& Store::Reader() const {
+    if (m_reader == nullptr)
+        m_reader = std::make_unique<StoreReader>(*m_database);
+    return *m_reader;
 }
 
 Gesture Store::Read(const std::string& id) const {
-    const bool sums = StoreVersion(*m_database) > kStoreSchemaWithoutChecksums;
-    Statement row(*m_database, sums ? kReadOne : kReadOneOfVersion1, "read the gesture");
-    row.At(GesturePlace(id));
-    row.Bind(1, id);
-    if (!row.Step())
-        throw Error(Path(), GesturePlace(id), "is not in the store, expected one of its ids");
-    return GestureFromRow(*m_database, row);
+    return Reader().Read(id, GesturePlace(id));
+}
+
+Gesture Store::ReadRow(int64_t seq) const {
+    return Reader().Read(seq, fmt::format("gesture row {}", seq));
 }
 
 void Store::ForEach(const std::function<void(const Gesture&)>& visit) const {
-    CheckNoneIsMissing(*m_database);
-    const bool sums = StoreVersion(*m_database) > kStoreSchemaWithoutChecksums;
-    Statement row(*m_database, sums ? kReadAll : kReadAllOfVersion1, "read the gestures");
-    while (row.Step()) {
-        visit(GestureFromRow(*m_database, row));
-        row.At("");
-    }
+    Extent();
+    Reader().ReadAll(visit);
 }
 
 }  // namespace host

@@ -198,7 +198,7 @@ TEST_F(Command, ParametersOfAnotherGeometryAreBadInput) {
     for (const char* more : {"", " --gesture a"}) {
         const Outcome outcome = Run(std::string("replay c.db --params wide.toml") + more);
         EXPECT_EQ(outcome.exitCode, 3);
-        EXPECT_THAT(outcome.err, StartsWith("fpnavi: c.db: gesture 'a': "));
+        EXPECT_THAT(outcome.err, StartsWith("fpnavi: wide.toml:1:19: s_blockColNumFp = 8 "));
     }
 }
 

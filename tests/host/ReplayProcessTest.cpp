@@ -4,15 +4,15 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <csignal>
-#include <filesystem>
-#include <fstream>
+#include <optional>
+#include <stdexcept>
 
 #include "GestureBuilder.h"
+#include "HostTestSupport.h"
 #include "common/Error.h"
-#include "replay/ReplayCorpus.h"
 #include "replay/ReplayProcess.h"
-#include "store/Store.h"
 
 namespace {
 
@@ -20,6 +20,7 @@ using host::Gesture;
 using host::Mode;
 using host::ReplayAll;
 using host::ReplayResult;
+using host::Verdict;
 using host_test::GestureBuilder;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
@@ -116,92 +117,171 @@ TEST(ReplayProcess, NothingToReplayIsFine) {
     EXPECT_THAT(ReplayAll({}), IsEmpty());
 }
 
-TEST(ReplayProcess, ACrashIsReportedWithTheGestureAndTheRestIsReplayed) {
-    const std::vector<Gesture> gestures = {Right("a"), Right("b"), Right("c")};
+// A job over gestures, whose reader does something else first.
+host::ReplayJob JobOver(const std::vector<Gesture>& gestures,
+                        const std::function<void(size_t)>& beforeReading) {
     host::ReplayJob job;
     job.processes = 1;
-    job.ids = {"a", "b", "c"};
-    job.openReader = [&gestures] {
-        return host::GestureReader([&gestures](size_t index) {
-            if (index == 1)
-                std::raise(SIGKILL);
+    job.next = [&gestures, index = size_t{0}]() mutable -> std::optional<host::GestureHead> {
+        if (index == gestures.size())
+            return std::nullopt;
+        host::GestureHead head;
+        head.seq = static_cast<int64_t>(index);
+        head.id = gestures[index].id;
+        head.mode = gestures[index++].mode;
+        head.tier = "hard";
+        return head;
+    };
+    job.openReader = [&gestures, beforeReading] {
+        return host::GestureReader([&gestures, beforeReading](int64_t seq) {
+            const auto index = static_cast<size_t>(seq);
+            beforeReading(index);
             return gestures[index];
         });
     };
+    return job;
+}
+
+std::vector<ReplayResult> ResultsOf(const host::ReplayJob& job) {
     std::vector<ReplayResult> results;
     host::ReplayMany(job, [&](size_t, const ReplayResult& result) { results.push_back(result); });
+    return results;
+}
+
+TEST(ReplayProcess, ACrashIsReportedWithTheGestureAndTheRestIsReplayed) {
+    const std::vector<Gesture> gestures = {Right("a"), Right("b"), Right("c")};
+    const std::vector<ReplayResult> results = ResultsOf(JobOver(gestures, [](size_t index) {
+        if (index == 1)
+            std::raise(SIGKILL);
+    }));
     ASSERT_THAT(Ids(results), ElementsAre("a", "b", "c"));
     EXPECT_THAT(results[1].errors, ElementsAre(HasSubstr("signal 9")));
-    EXPECT_EQ(results[1].verdict, host::Verdict::Wrong);
+    EXPECT_EQ(results[1].verdict, Verdict::Wrong);
+    EXPECT_EQ(results[1].tier, "hard");
     EXPECT_EQ(results[2].key, VKEY_RIGHT);
 }
 
-TEST(ReplayProcess, AnErrorOfTheReaderNamesTheSource) {
-    host::ReplayJob job;
-    job.source = "some.db";
-    job.ids = {"a"};
-    job.openReader = [] {
-        return host::GestureReader(
-            [](size_t) -> Gesture { throw host::Error("some.db", "gesture 'a'", "is damaged"); });
-    };
-    try {
-        host::ReplayMany(job, [](size_t, const ReplayResult&) {});
-        FAIL() << "no error";
-    } catch (const host::Error& error) {
-        EXPECT_STREQ(error.what(), "some.db: gesture 'a': is damaged");
+TEST(ReplayProcess, AGestureThatCannotBeReadIsOneResultAndTheRestIsReplayed) {
+    const std::vector<Gesture> gestures = {Right("a"), DoubleScan("b"), Right("c")};
+    const std::vector<ReplayResult> results = ResultsOf(JobOver(gestures, [](size_t index) {
+        if (index < 2)
+            throw host::Error("some.db", "gesture", "is damaged");
+    }));
+    ASSERT_THAT(Ids(results), ElementsAre("a", "b", "c"));
+    for (const size_t i : {0, 1}) {
+        EXPECT_EQ(results[i].verdict, Verdict::Unreadable);
+        EXPECT_THAT(results[i].errors, ElementsAre("some.db: gesture: is damaged"));
+        EXPECT_EQ(results[i].mode, gestures[i].mode);
+        EXPECT_EQ(results[i].tier, "hard");
+        EXPECT_EQ(results[i].key, -1);
+    }
+    EXPECT_EQ(results[2].verdict, Verdict::Right);
+}
+
+TEST(ReplayProcess, AGestureThatTheModuleCannotBeGivenIsOneResult) {
+    Gesture odd = Right("odd");
+    odd.frames[1].raw.pop_back();
+    const std::vector<ReplayResult> results = ReplayAll({odd, Right("a")}, 1);
+    EXPECT_EQ(results.at(0).verdict, Verdict::Unreadable);
+    EXPECT_THAT(results.at(0).errors, ElementsAre(HasSubstr("gesture 'odd'")));
+    EXPECT_EQ(results.at(1).verdict, Verdict::Right);
+}
+
+// Each reading leaves a byte in a pipe, from whichever process.
+TEST(ReplayProcess, EachGestureIsReadOnce) {
+    int ends[2];
+    ASSERT_EQ(pipe(ends), 0);
+    const std::vector<Gesture> gestures = {Right("a"), DoubleScan("b"), Right("c"),
+                                           DoubleScan("d")};
+    ResultsOf(JobOver(gestures, [&](size_t index) {
+        const auto byte = static_cast<char>('a' + index);
+        if (write(ends[1], &byte, 1) != 1)
+            std::raise(SIGKILL);
+    }));
+    close(ends[1]);
+    std::string reads(100, ' ');
+    const ssize_t count = read(ends[0], reads.data(), reads.size());
+    close(ends[0]);
+    reads.resize(static_cast<size_t>(std::max<ssize_t>(count, 0)));
+    std::sort(reads.begin(), reads.end());
+    EXPECT_EQ(reads, "abcd");
+}
+
+// The list goes on only while results are given: whatever the order of the modes, few gestures are
+// under way at any moment.
+TEST(ReplayProcess, GesturesAndResultsUnderWayAreBounded) {
+    const Gesture plain = Right("p");
+    const Gesture twice = DoubleScan("d");
+    constexpr size_t kGestures = 1500;
+    const auto isTwice = [](size_t index) { return index == 0 || index > kGestures / 2; };
+    for (const int32_t processes : {1, 2}) {
+        size_t listed = 0;
+        size_t given = 0;
+        size_t most = 0;
+        host::ReplayJob job;
+        job.processes = processes;
+        job.next = [&]() -> std::optional<host::GestureHead> {
+            if (listed == kGestures)
+                return std::nullopt;
+            host::GestureHead head;
+            head.seq = static_cast<int64_t>(listed);
+            head.mode = isTwice(listed++) ? Mode::DoubleScan : Mode::Fp;
+            most = std::max(most, listed - given);
+            return head;
+        };
+        job.openReader = [&] {
+            return host::GestureReader(
+                [&](int64_t seq) { return isTwice(static_cast<size_t>(seq)) ? twice : plain; });
+        };
+        host::ReplayMany(job,
+                         [&](size_t index, const ReplayResult&) { EXPECT_EQ(index, given++); });
+        EXPECT_EQ(given, kGestures);
+        EXPECT_LE(most, 256U * static_cast<size_t>(processes));
     }
 }
 
-class ReplayCorpus : public ::testing::Test {
-  protected:
-    void SetUp() override {
-        std::string name = (std::filesystem::temp_directory_path() / "fpnavi-XXXXXX").string();
-        ASSERT_NE(mkdtemp(name.data()), nullptr);
-        m_folder = name;
-    }
-    void TearDown() override { std::filesystem::remove_all(m_folder); }
-
-    std::string Write(const char* name, const std::string& text) const {
-        const std::string path = m_folder / name;
-        std::ofstream(path) << text;
-        return path;
-    }
-
-    std::filesystem::path m_folder;
-};
-
-TEST_F(ReplayCorpus, ReplaysAStoreInItsOrderWithOverrides) {
-    host::CorpusReplay replay;
-    replay.path = m_folder / "corpus.db";
-    {
-        host::Store store = host::Store::Create(replay.path);
-        for (const Gesture& gesture : {DoubleScan("z"), Right("y"), Resting("x")})
-            store.Append(gesture);
-    }
-    std::vector<ReplayResult> results;
-    const host::ResultSink sink = [&](size_t, const ReplayResult& result) {
-        results.push_back(result);
+TEST(ReplayProcess, AResultIsGivenBeforeTheListEnds) {
+    const std::vector<Gesture> gestures = {DoubleScan("d"), Right("a")};
+    size_t given = 0;
+    size_t givenAtTheEnd = 0;
+    size_t listed = 0;
+    host::ReplayJob job = JobOver(gestures, [](size_t) {});
+    job.openReader = [&gestures] {
+        return host::GestureReader([&gestures](int64_t seq) { return gestures[seq == 0 ? 0 : 1]; });
     };
-    host::ReplayCorpus(replay, sink);
-    EXPECT_THAT(Ids(results), ElementsAre("z", "y", "x"));
-    EXPECT_EQ(results[1].key, VKEY_RIGHT);
-    results.clear();
-    replay.overrides = host::ReadOverrides(Write("back.toml", "s_sensorBackFlag = 1\n"));
-    host::ReplayCorpus(replay, sink);
-    EXPECT_EQ(results[1].key, VKEY_LEFT);
+    job.next = [&]() -> std::optional<host::GestureHead> {
+        constexpr size_t kMore = 1000;  // than may be under way
+        if (listed == kMore) {
+            givenAtTheEnd = given;
+            return std::nullopt;
+        }
+        host::GestureHead head;
+        head.seq = static_cast<int64_t>(listed);
+        head.mode = listed++ == 0 ? Mode::DoubleScan : Mode::Fp;
+        return head;
+    };
+    host::ReplayMany(job, [&](size_t, const ReplayResult&) { ++given; });
+    EXPECT_EQ(given, 1000U);
+    EXPECT_GE(givenAtTheEnd, 1000U - 256U);
 }
 
-TEST_F(ReplayCorpus, OverridesAreWhatTheFileNamesAndNoMore) {
-    const host::ParamOverrides overrides = host::ReadOverrides(Write(
-        "some.toml", "s_minDelta = 0\ns_sensorBackFlag = 1\n_NAVI_range_mean.RANGE_LOW = 7\n"));
-    host::ParamBlock params = host::DefaultParams();
-    host::ParamBlock expected = params;
-    host::ApplyOverrides(overrides, &params);
-    host::ParamValue(expected, "s_minDelta") = 0;
-    host::ParamValue(expected, "s_sensorBackFlag") = 1;
-    host::ParamValue(expected, "_NAVI_range_mean.RANGE_LOW") = 7;
-    EXPECT_EQ(params, expected);
-    EXPECT_EQ(overrides.size(), 3U);
+TEST(ReplayProcess, AnErrorOfOpeningTheReaderEndsTheReplay) {
+    const std::vector<Gesture> gestures = {Right("a")};
+    host::ReplayJob job = JobOver(gestures, [](size_t) {});
+    job.openReader = []() -> host::GestureReader {
+        throw host::Error("some.db", "", "cannot be opened");
+    };
+    EXPECT_EQ(host_test::ErrorOf([&] { ResultsOf(job); }), "some.db: cannot be opened");
+}
+
+TEST(ReplayProcess, WhatTheSinkThrowsEndsTheReplay) {
+    const std::vector<Gesture> gestures = {Right("a"), Right("b")};
+    const auto replay = [&] {
+        host::ReplayMany(JobOver(gestures, [](size_t) {}),
+                         [](size_t, const ReplayResult&) { throw std::runtime_error("enough"); });
+    };
+    EXPECT_THROW(replay(), std::runtime_error);
+    EXPECT_EQ(waitpid(-1, nullptr, WNOHANG), -1);  // no child is left
 }
 
 }  // namespace

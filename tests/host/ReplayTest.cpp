@@ -163,7 +163,29 @@ TEST(JudgeKey, AnyOtherKeyIsWrong) {
 TEST(JudgeKey, WithoutALabelAKeyIsAcceptedOrWrong) {
     EXPECT_EQ(host::JudgeKey(VKEY_UP, std::nullopt, {VKEY_UP, VKEY_RIGHT}), Verdict::Accepted);
     EXPECT_EQ(host::JudgeKey(VKEY_DOWN, std::nullopt, {VKEY_UP, VKEY_RIGHT}), Verdict::Wrong);
-    EXPECT_EQ(host::JudgeKey(VKEY_DOWN, std::nullopt, {}), Verdict::Wrong);
+}
+
+TEST(JudgeKey, WithoutALabelAndAcceptedKeysNothingIsKnown) {
+    EXPECT_EQ(host::JudgeKey(VKEY_DOWN, std::nullopt, {}), Verdict::Unknown);
+    EXPECT_EQ(host::JudgeKey(VKEY_NO_MOVE, std::nullopt, {}), Verdict::Unknown);
+}
+
+TEST(JudgeKey, AnAcceptedListOfAnotherLabelDoesNotCount) {
+    EXPECT_EQ(host::JudgeKey(VKEY_UP, VKEY_DOWN, {VKEY_UP}), Verdict::Wrong);
+    EXPECT_EQ(host::JudgeKey(VKEY_NO_MOVE, VKEY_DOWN, {VKEY_UP, VKEY_NO_MOVE}), Verdict::Wrong);
+    EXPECT_EQ(host::JudgeKey(VKEY_DOWN, VKEY_DOWN, {VKEY_UP}), Verdict::Right);
+    EXPECT_EQ(host::JudgeKey(VKEY_UP, VKEY_DOWN, {}), Verdict::Wrong);
+}
+
+TEST(Replay, AFailedCallIsWrongWithoutALabelToo) {
+    const ReplayResult result = ReplayHere(
+        GestureBuilder(Mode::Fp).Param("s_templateWidth", 0).Skin(0).Skin(6).Empty().Get());
+    EXPECT_EQ(result.verdict, Verdict::Wrong);
+}
+
+TEST(Replay, WithoutALabelTheVerdictIsUnknown) {
+    EXPECT_EQ(ReplayHere(GestureBuilder(Mode::Fp).Skin(0).Skin(6).Empty().Get()).verdict,
+              Verdict::Unknown);
 }
 
 }  // namespace

@@ -12,7 +12,7 @@ namespace command {
 
 // Exit codes of the program.
 inline constexpr int kFine = 0;
-inline constexpr int kFound = 1;     // wrong keys, a calibration out of its band
+inline constexpr int kFound = 1;     // wrong keys, failed calls, a calibration out of its band
 inline constexpr int kUsage = 2;     // the command line makes no sense
 inline constexpr int kBadInput = 3;  // a file, its content, or stdout
 

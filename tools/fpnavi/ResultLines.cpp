@@ -12,6 +12,8 @@ Colour VerdictColour(host::Verdict verdict) {
             return Colour::Green;
         case host::Verdict::Accepted:
             return Colour::Yellow;
+        case host::Verdict::Unknown:
+            return Colour::None;
         default:
             return Colour::Red;
     }
@@ -36,66 +38,99 @@ Json ResultJson(const host::ReplayResult& result) {
     return json;
 }
 
+void Summary::Counts::Add(const Counts& other) {
+    all += other.all;
+    for (size_t i = 0; i < verdicts.size(); ++i)
+        verdicts[i] += other.verdicts[i];
+    failed += other.failed;
+}
+
 void Summary::Add(const host::ReplayResult& result) {
-    Counts one{1, 0, 0, 0};
-    (result.verdict == host::Verdict::Right      ? one.right
-     : result.verdict == host::Verdict::Accepted ? one.accepted
-                                                 : one.wrong) = 1;
-    Count(one, &m_counts[{result.mode, result.tier}]);
+    Counts& counts = m_counts[{result.mode, result.tier}];
+    ++counts.all;
+    ++counts.verdicts[static_cast<size_t>(result.verdict)];
+    if (result.verdict == host::Verdict::Wrong && !result.errors.empty())
+        ++counts.failed;
 }
 
-void Summary::Count(const Counts& from, Counts* to) {
-    to->all += from.all;
-    to->right += from.right;
-    to->accepted += from.accepted;
-    to->wrong += from.wrong;
+int64_t Summary::Count(host::Verdict verdict) const {
+    return All().Of(verdict);
 }
 
-int64_t Summary::Wrong() const {
-    int64_t wrong = 0;
+Summary::Counts Summary::All() const {
+    Counts all;
     for (const auto& entry : m_counts)
-        wrong += entry.second.wrong;
-    return wrong;
+        all.Add(entry.second);
+    return all;
 }
 
-void Summary::WriteLine(bool json, const Table& table, const std::string& mode,
-                        const std::string& tier, const Counts& counts) {
-    if (json) {
-        WriteJson("summary", {{"mode", mode},
-                              {"tier", tier},
-                              {"count", counts.all},
-                              {"right", counts.right},
-                              {"accepted", counts.accepted},
-                              {"wrong", counts.wrong}});
-        return;
-    }
-    table.Row({mode, tier, Cell(counts.all), Cell(counts.right), Cell(counts.accepted),
-               Cell(std::to_string(counts.wrong), counts.wrong > 0 ? Colour::Red : Colour::None)});
+void Summary::WriteJsonLine(const std::string& mode, const std::string& tier,
+                            const Counts& counts) {
+    WriteJson("summary", {{"mode", mode},
+                          {"tier", tier},
+                          {"count", counts.all},
+                          {"right", counts.Of(host::Verdict::Right)},
+                          {"accepted", counts.Of(host::Verdict::Accepted)},
+                          {"wrong", counts.Of(host::Verdict::Wrong)},
+                          {"failed", counts.failed},
+                          {"unknown", counts.Of(host::Verdict::Unknown)},
+                          {"unreadable", counts.Of(host::Verdict::Unreadable)}});
+}
+
+std::vector<Column> Summary::Columns(const Counts& all) {
+    std::vector<Column> columns = {{"mode", 4},        {"tier", 6},           {"count", 7, true},
+                                   {"right", 7, true}, {"accepted", 8, true}, {"wrong", 7, true}};
+    if (all.failed > 0)
+        columns.push_back({"failed", 7, true});
+    if (all.Of(host::Verdict::Unknown) > 0)
+        columns.push_back({"unknown", 7, true});
+    if (all.Of(host::Verdict::Unreadable) > 0)
+        columns.push_back({"unreadable", 10, true});
+    return columns;
+}
+
+std::vector<Cell> Summary::Row(const std::string& mode, const std::string& tier,
+                               const Counts& counts, const Counts& all) {
+    const auto red = [](int64_t count) {
+        return Cell(std::to_string(count), count > 0 ? Colour::Red : Colour::None);
+    };
+    std::vector<Cell> row = {mode,
+                             tier,
+                             Cell(counts.all),
+                             Cell(counts.Of(host::Verdict::Right)),
+                             Cell(counts.Of(host::Verdict::Accepted)),
+                             red(counts.Of(host::Verdict::Wrong))};
+    if (all.failed > 0)
+        row.push_back(red(counts.failed));
+    if (all.Of(host::Verdict::Unknown) > 0)
+        row.emplace_back(counts.Of(host::Verdict::Unknown));
+    if (all.Of(host::Verdict::Unreadable) > 0)
+        row.push_back(red(counts.Of(host::Verdict::Unreadable)));
+    return row;
 }
 
 void Summary::Write(bool json) const {
-    const Table table({{"mode", 4},
-                       {"tier", 6},
-                       {"count", 7, true},
-                       {"right", 7, true},
-                       {"accepted", 8, true},
-                       {"wrong", 7, true}});
+    const Counts all = All();
+    const Table table(Columns(all));
+    const auto line = [&](const std::string& mode, const std::string& tier, const Counts& counts) {
+        if (json)
+            WriteJsonLine(mode, tier, counts);
+        else
+            table.Row(Row(mode, tier, counts, all));
+    };
     if (!json)
         table.Head();
     std::map<host::Mode, Counts> modes;
-    Counts all;
-    for (const auto& [group, counts] : m_counts) {
-        Count(counts, &modes[group.first]);
-        Count(counts, &all);
-    }
+    for (const auto& [group, counts] : m_counts)
+        modes[group.first].Add(counts);
     for (const auto& [mode, counts] : modes) {
         for (const auto& [group, part] : m_counts) {
             if (group.first == mode && !group.second.empty())
-                WriteLine(json, table, host::ModeName(mode), group.second, part);
+                line(host::ModeName(mode), group.second, part);
         }
-        WriteLine(json, table, host::ModeName(mode), "all", counts);
+        line(host::ModeName(mode), "all", counts);
     }
-    WriteLine(json, table, "all", "all", all);
+    line("all", "all", all);
 }
 
 }  // namespace command

@@ -19,7 +19,8 @@ constexpr const char* kFooter = R"(Examples:
   fpnavi params --mode hg
   fpnavi tune --seed 1
 
-Exit codes: 0 fine, 1 wrong keys or a failed calibration, 2 usage, 3 bad input or output.
+Exit codes: 0 fine, 1 wrong keys, failed calls or a failed calibration, 2 usage, 3 bad input or
+output.
 Recordings hold pictures of fingerprints: store and share them as biometric data.)";
 
 // The first word that is no option names the subcommand. Checked before all else, since a --help
