@@ -32,7 +32,7 @@ class Store {
     static Store Create(const std::string& path, IfExists ifExists = IfExists::Fail);
 
     // An existing one. Error for a file that is missing, empty, truncated, no SQLite file, another
-    // program's database or of a newer schema. Appending brings an older schema to this one.
+    // program's database or of another schema version.
     static Store OpenForReading(const std::string& path);
     static Store OpenForAppending(const std::string& path);
 

@@ -19,16 +19,14 @@ constexpr int64_t kInt32Max = std::numeric_limits<int32_t>::max();
 constexpr int64_t kUint32Max = std::numeric_limits<uint32_t>::max();
 
 // The columns that GestureFromRow reads, in its order.
-#define FPNAVI_GESTURE_COLUMNS(checksum)                                                     \
+#define FPNAVI_GESTURE_COLUMNS                                                               \
     "SELECT g.seq, g.id, p.params, g.mode, g.block_width, g.block_height, g.block_col_num, " \
     "g.block_row_num, g.frame_count, g.end, g.label, g.accepted, g.tier, g.tags, "           \
-    "g.library_version, g.notes, " checksum                                                  \
-    " FROM gesture g LEFT JOIN param_block p ON p.id = g.param_block "
+    "g.library_version, g.notes, g.checksum "                                                \
+    "FROM gesture g LEFT JOIN param_block p ON p.id = g.param_block "
 
-constexpr const char* kReadOne = FPNAVI_GESTURE_COLUMNS("g.checksum") "WHERE g.id = ?";
-constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS("g.checksum") "ORDER BY g.seq";
-constexpr const char* kReadOneOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "WHERE g.id = ?";
-constexpr const char* kReadAllOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "ORDER BY g.seq";
+constexpr const char* kReadOne = FPNAVI_GESTURE_COLUMNS "WHERE g.id = ?";
+constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS "ORDER BY g.seq";
 #undef FPNAVI_GESTURE_COLUMNS
 
 constexpr const char* kReadFrames =
@@ -215,8 +213,7 @@ bool Store::Contains(const std::string& id) const {
 }
 
 Gesture Store::Read(const std::string& id) const {
-    const bool sums = StoreVersion(*m_database) > kStoreSchemaWithoutChecksums;
-    Statement row(*m_database, sums ? kReadOne : kReadOneOfVersion1, "read the gesture");
+    Statement row(*m_database, kReadOne, "read the gesture");
     row.At(GesturePlace(id));
     row.Bind(1, id);
     if (!row.Step())
@@ -226,8 +223,7 @@ Gesture Store::Read(const std::string& id) const {
 
 void Store::ForEach(const std::function<void(const Gesture&)>& visit) const {
     CheckNoneIsMissing(*m_database);
-    const bool sums = StoreVersion(*m_database) > kStoreSchemaWithoutChecksums;
-    Statement row(*m_database, sums ? kReadAll : kReadAllOfVersion1, "read the gestures");
+    Statement row(*m_database, kReadAll, "read the gestures");
     while (row.Step()) {
         visit(GestureFromRow(*m_database, row));
         row.At("");

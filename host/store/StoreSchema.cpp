@@ -128,11 +128,10 @@ void CheckIdentity(const Database& database) {
                     fmt::format("a SQLite database of another program (application id {:#x}, "
                                 "expected {:#x} of a recording store)",
                                 application, kStoreApplicationId));
-    const int64_t version = StoreVersion(database);
-    if (version < kStoreSchemaWithoutChecksums || version > kStoreSchemaVersion)
+    const int64_t version = database.Number("PRAGMA user_version", "read the schema version");
+    if (version != kStoreSchemaVersion)
         throw Error(database.Path(), "",
-                    fmt::format("schema version {}, expected {} to {}{}", version,
-                                kStoreSchemaWithoutChecksums, kStoreSchemaVersion,
+                    fmt::format("schema version {}, expected {}{}", version, kStoreSchemaVersion,
                                 version > kStoreSchemaVersion
                                     ? ": written by a newer version of this program"
                                     : ""));
@@ -163,25 +162,6 @@ void CreateSchema(Database& database) {
                                  kStoreApplicationId, kStoreSchemaVersion)
                          .c_str(),
                      kDoing);
-    transaction.Commit();
-}
-
-int64_t StoreVersion(const Database& database) {
-    return database.Number("PRAGMA user_version", "read the schema version");
-}
-
-void UpgradeSchema(Database& database) {
-    if (StoreVersion(database) != kStoreSchemaWithoutChecksums)
-        return;
-    constexpr const char* kDoing = "add the checksums";
-    Transaction transaction(database, kDoing);
-    // Checked again within the transaction: another process may have done it meanwhile.
-    if (StoreVersion(database) == kStoreSchemaWithoutChecksums)
-        database.Execute(
-            fmt::format("ALTER TABLE gesture ADD COLUMN checksum INTEGER; PRAGMA user_version = {}",
-                        kStoreSchemaVersion)
-                .c_str(),
-            kDoing);
     transaction.Commit();
 }
 

@@ -113,7 +113,6 @@ Store Store::OpenForAppending(const std::string& path) {
     if (sqlite3_db_readonly(database->Handle(), "main") == 1)
         throw Error(path, "", "cannot be written, expected a file with write permission");
     PrepareForAppending(*database);
-    UpgradeSchema(*database);
     return Store(std::move(database), true);
 }
 

@@ -64,10 +64,13 @@ TEST(StoreOpen, DatabaseOfAnotherProgramIsRefused) {
 
 TEST(StoreOpen, OtherSchemaVersionsAreRefused) {
     const std::string path = StoreOf({SmallGesture("a")});
-    RunSql(path, "PRAGMA user_version = 3");
-    EXPECT_THAT(OpenError(path), HasSubstr("version 3, expected 1 to 2: written by a newer"));
-    RunSql(path, "PRAGMA user_version = 0");
-    EXPECT_THAT(OpenError(path), HasSubstr("schema version 0, expected 1 to 2"));
+    RunSql(path, "PRAGMA user_version = 4");
+    EXPECT_THAT(OpenError(path), HasSubstr("schema version 4, expected 3: written by a newer"));
+    for (const char* version : {"0", "1", "2"}) {
+        RunSql(path, std::string("PRAGMA user_version = ") + version);
+        EXPECT_THAT(OpenError(path),
+                    HasSubstr(std::string("schema version ") + version + ", expected 3"));
+    }
 }
 
 TEST(StoreOpen, MissingTableIsRefused) {
