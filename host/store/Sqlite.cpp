@@ -82,7 +82,9 @@ void Statement::Bind(int parameter, std::string_view text) {
 }
 
 void Statement::BindBlob(int parameter, const std::vector<uint8_t>& blob) {
-    CheckBound(sqlite3_bind_blob64(m_handle, parameter, blob.data(), blob.size(), SQLITE_STATIC));
+    // A null pointer would bind NULL instead of an empty blob.
+    const void* const bytes = blob.empty() ? static_cast<const void*>("") : blob.data();
+    CheckBound(sqlite3_bind_blob64(m_handle, parameter, bytes, blob.size(), SQLITE_STATIC));
 }
 
 void Statement::BindNull(int parameter) {

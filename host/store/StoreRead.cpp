@@ -30,8 +30,10 @@ constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS "ORDER BY g.seq";
 #undef FPNAVI_GESTURE_COLUMNS
 
 constexpr const char* kReadFrames =
-    "SELECT frame_index, raw, reg24, reg28, x16, y16, presence FROM frame WHERE gesture = ? "
+    "SELECT frame_index, reg24, reg28, x16, y16, presence FROM frame WHERE gesture = ? "
     "ORDER BY frame_index";
+
+constexpr const char* kReadPixels = "SELECT raw FROM pixels WHERE gesture = ?";
 
 std::vector<std::string> TextList(const Statement& row, int column, const char* name) {
     const nlohmann::json list = nlohmann::json::parse(row.Text(column), nullptr, false);
@@ -84,12 +86,11 @@ std::optional<int32_t> OptionalInteger(const Statement& row, int column, int64_t
 
 RecordedFrame FrameFromRow(const Statement& row) {
     RecordedFrame frame;
-    frame.raw = row.Blob(1);
-    frame.reg24 = static_cast<uint32_t>(row.Integer(2, 0, kUint32Max));
-    frame.reg28 = static_cast<uint32_t>(row.Integer(3, 0, kUint32Max));
-    frame.x16 = OptionalInteger(row, 4, kInt32Min, kInt32Max);
-    frame.y16 = OptionalInteger(row, 5, kInt32Min, kInt32Max);
-    const std::optional<int32_t> presence = OptionalInteger(row, 6, -1, 1);
+    frame.reg24 = static_cast<uint32_t>(row.Integer(1, 0, kUint32Max));
+    frame.reg28 = static_cast<uint32_t>(row.Integer(2, 0, kUint32Max));
+    frame.x16 = OptionalInteger(row, 3, kInt32Min, kInt32Max);
+    frame.y16 = OptionalInteger(row, 4, kInt32Min, kInt32Max);
+    const std::optional<int32_t> presence = OptionalInteger(row, 5, -1, 1);
     if (presence)
         frame.presence = static_cast<Presence>(*presence);
     return frame;
@@ -112,6 +113,26 @@ void ReadFrames(const Database& database, int64_t seq, int64_t count, Gesture& g
     if (static_cast<int64_t>(gesture.frames.size()) != count) {
         row.At(place);
         row.FailRow(fmt::format("has {} frames, expected {}", gesture.frames.size(), count));
+    }
+}
+
+// Gives each frame of the gesture an equal part of the pixels; CheckGesture looks at its size.
+void ReadPixels(const Database& database, int64_t seq, Gesture& gesture) {
+    Statement row(database, kReadPixels, "read the pixels");
+    row.Bind(1, seq);
+    row.At(GesturePlace(gesture.id));
+    if (!row.Step())
+        row.FailRow("has no pixels, expected those of its frames");
+    const std::vector<uint8_t> raw = row.Blob(0);
+    const size_t count = gesture.frames.size();
+    if (count == 0 ? !raw.empty() : raw.size() % count != 0)
+        row.FailRow(fmt::format("has {} bytes of pixels, expected {} frames of equal size",
+                                raw.size(), count));
+    auto next = raw.begin();
+    for (RecordedFrame& frame : gesture.frames) {
+        const auto end = next + static_cast<std::ptrdiff_t>(raw.size() / count);
+        frame.raw.assign(next, end);
+        next = end;
     }
 }
 
@@ -157,8 +178,9 @@ Gesture GestureFromRow(const Database& database, Statement& row) {
     gesture.tags = TextList(row, 13, "tags");
     gesture.libraryVersion = row.Text(14);
     gesture.notes = row.Text(15);
-    ReadFrames(database, row.Integer(0, INT64_MIN, INT64_MAX), row.Integer(8, 0, kInt32Max),
-               gesture);
+    const int64_t seq = row.Integer(0, INT64_MIN, INT64_MAX);
+    ReadFrames(database, seq, row.Integer(8, 0, kInt32Max), gesture);
+    ReadPixels(database, seq, gesture);
     CheckGesture(gesture, database.Path());
     row.At(place);
     CheckChecksum(row, 16, gesture);

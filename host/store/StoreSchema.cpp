@@ -20,7 +20,9 @@ namespace host {
 namespace {
 
 // Names instead of numbers wherever a person may look with a SQLite shell. A parameter block is
-// stored once for all gestures that share it. The checksum is null where nobody has made one.
+// stored once for all gestures that share it. The checksum is null where nobody has made one. The
+// pixels of a gesture are one blob: SQLite fills the pages of a long one to the last byte, while
+// rows of half a page leave much of each empty.
 constexpr const char* kTables = R"(
 CREATE TABLE param_block (
     id     INTEGER PRIMARY KEY,
@@ -48,14 +50,22 @@ CREATE TABLE gesture (
 CREATE TABLE frame (
     gesture     INTEGER NOT NULL REFERENCES gesture (seq) ON DELETE CASCADE,
     frame_index INTEGER NOT NULL CHECK (frame_index >= 0),
-    raw         BLOB NOT NULL CHECK (typeof(raw) = 'blob'),
     reg24       INTEGER NOT NULL CHECK (reg24 BETWEEN 0 AND 4294967295),
     reg28       INTEGER NOT NULL CHECK (reg28 BETWEEN 0 AND 4294967295),
     x16         INTEGER,
     y16         INTEGER,
     presence    INTEGER CHECK (presence IN (-1, 0, 1)),
     PRIMARY KEY (gesture, frame_index)
+) WITHOUT ROWID;
+CREATE TABLE pixels (
+    gesture INTEGER PRIMARY KEY REFERENCES gesture (seq) ON DELETE CASCADE,
+    raw     BLOB NOT NULL CHECK (typeof(raw) = 'blob')
 );
+CREATE VIEW frame_raw AS
+    SELECT id, gesture, frame_index,
+           substr(raw, frame_index * length(raw) / frame_count + 1, length(raw) / frame_count)
+               AS raw
+    FROM gesture JOIN frame ON frame.gesture = seq JOIN pixels USING (gesture);
 )";
 
 // The start of every SQLite file; numbers are big-endian.
@@ -137,9 +147,10 @@ void CheckIdentity(const Database& database) {
                                     : ""));
     // Reading the schema shows missing tables and columns now rather than at the first gesture.
     constexpr const char* kDoing = "find the tables of a recording store";
-    for (const char* sql : {"SELECT id, params FROM param_block",
-                            "SELECT seq, id, param_block, frame_count FROM gesture",
-                            "SELECT gesture, frame_index, raw FROM frame"})
+    for (const char* sql :
+         {"SELECT id, params FROM param_block",
+          "SELECT seq, id, param_block, frame_count FROM gesture",
+          "SELECT gesture, frame_index, reg24 FROM frame", "SELECT gesture, raw FROM pixels"})
         const Statement readable(database, sql, kDoing);
 }
 

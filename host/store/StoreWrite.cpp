@@ -78,23 +78,34 @@ int64_t StoreGestureRow(const Database& database, const Gesture& gesture, int64_
 
 void StoreFrames(const Database& database, const Gesture& gesture, int64_t gestureSeq) {
     Statement insert(database,
-                     "INSERT INTO frame (gesture, frame_index, raw, reg24, reg28, x16, y16, "
-                     "presence) VALUES (?, ?, ?, ?, ?, ?, ?, ?)",
+                     "INSERT INTO frame (gesture, frame_index, reg24, reg28, x16, y16, presence) "
+                     "VALUES (?, ?, ?, ?, ?, ?, ?)",
                      "store the frames");
     insert.At(GesturePlace(gesture.id));
     int64_t index = 0;
     for (const RecordedFrame& frame : gesture.frames) {
         insert.Bind(1, gestureSeq);
         insert.Bind(2, index++);
-        insert.BindBlob(3, frame.raw);
-        insert.Bind(4, frame.reg24);
-        insert.Bind(5, frame.reg28);
-        insert.BindOptional(6, frame.x16);
-        insert.BindOptional(7, frame.y16);
-        insert.BindOptional(8, frame.presence);
+        insert.Bind(3, frame.reg24);
+        insert.Bind(4, frame.reg28);
+        insert.BindOptional(5, frame.x16);
+        insert.BindOptional(6, frame.y16);
+        insert.BindOptional(7, frame.presence);
         insert.Step();
         insert.Reset();
     }
+}
+
+void StorePixels(const Database& database, const Gesture& gesture, int64_t gestureSeq) {
+    std::vector<uint8_t> raw;
+    for (const RecordedFrame& frame : gesture.frames)
+        raw.insert(raw.end(), frame.raw.begin(), frame.raw.end());
+    Statement insert(database, "INSERT INTO pixels (gesture, raw) VALUES (?, ?)",
+                     "store the pixels");
+    insert.At(GesturePlace(gesture.id));
+    insert.Bind(1, gestureSeq);
+    insert.BindBlob(2, raw);
+    insert.Step();
 }
 
 }  // namespace
@@ -136,6 +147,7 @@ void Store::Append(const Gesture& gesture) {
     const int64_t paramBlock = StoreParams(*m_database, gesture.params);
     const int64_t seq = StoreGestureRow(*m_database, gesture, paramBlock);
     StoreFrames(*m_database, gesture, seq);
+    StorePixels(*m_database, gesture, seq);
     transaction.Commit();
 }
 

@@ -79,7 +79,7 @@ TEST(GestureChecksum, DoesNotCoverWhatPeopleSay) {
 
 TEST(StoreChecksum, TellsTheGestureThatWasChanged) {
     for (const char* sql :
-         {"UPDATE frame SET raw = zeroblob(2016) WHERE gesture = 2 AND frame_index = 1",
+         {"UPDATE pixels SET raw = zeroblob(3 * 2016) WHERE gesture = 2",
           "UPDATE frame SET reg24 = 1 WHERE gesture = 2 AND frame_index = 1",
           "UPDATE gesture SET end = 'timeout' WHERE seq = 2",
           "UPDATE gesture SET checksum = (checksum + 1) & 4294967295 WHERE seq = 2"}) {
