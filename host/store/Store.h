@@ -22,14 +22,10 @@ class Transaction;
 // file, also for appending.
 class Store {
   public:
-    enum class IfExists {
-        Fail,     // a file of that name is an error
-        Replace,  // a store (or an empty file) of that name is replaced; anything else is an error
-    };
-
-    // A new store, open for appending. A kill at any moment leaves what was there before, or the
-    // new store.
-    static Store Create(const std::string& path, IfExists ifExists = IfExists::Fail);
+    // A new store, open for appending, for its owner alone to read (0600). A file of that name is
+    // an Error (store/Replacement.h replaces one). A kill at any moment leaves nothing of that name
+    // or the new store.
+    static Store Create(const std::string& path);
 
     // An existing one. Error for a file that is missing, empty, truncated, no SQLite file, another
     // program's database or of another schema version.
@@ -62,6 +58,9 @@ class Store {
 
     int64_t Count() const;
 
+    // Gestures that do not have this tag.
+    int64_t CountWithoutTag(const std::string& tag) const;
+
     // In the order of appending; Error when the index of the ids has another number.
     std::vector<std::string> Ids() const;
 
@@ -77,8 +76,11 @@ class Store {
     const std::string& Path() const;
 
   private:
+    friend class Replacement;
+
     Store(std::unique_ptr<Database> database, bool appending);
-    void Close() noexcept;
+    // The tables in an empty file that nobody else knows yet; nothing guards it against a kill.
+    static Store MakeNew(const std::string& path);
 
     std::unique_ptr<Database> m_database;
     bool m_appending = false;

@@ -194,18 +194,9 @@ Store::Store(std::unique_ptr<Database> database, bool appending)
 
 Store::Store(Store&& other) noexcept = default;
 
-Store& Store::operator=(Store&& other) noexcept {
-    if (this != &other) {
-        Close();
-        m_database = std::move(other.m_database);
-        m_appending = other.m_appending;
-    }
-    return *this;
-}
+Store& Store::operator=(Store&& other) noexcept = default;
 
-Store::~Store() {
-    Close();
-}
+Store::~Store() = default;
 
 Store Store::OpenForReading(const std::string& path) {
     return Store(OpenStoreFile(path, false), false);
@@ -217,6 +208,16 @@ const std::string& Store::Path() const {
 
 int64_t Store::Count() const {
     return m_database->Number("SELECT count(*) FROM gesture", "count the gestures");
+}
+
+int64_t Store::CountWithoutTag(const std::string& tag) const {
+    Statement row(*m_database,
+                  "SELECT count(*) FROM gesture WHERE NOT json_valid(tags) OR "
+                  "NOT EXISTS (SELECT 1 FROM json_each(tags) WHERE value = ?)",
+                  "count the gestures by their tags");
+    row.Bind(1, tag);
+    row.Step();
+    return row.Integer(0, 0, INT64_MAX);
 }
 
 std::vector<std::string> Store::Ids() const {

@@ -14,6 +14,7 @@
 
 #include "common/Error.h"
 #include "parameters/ParamTable.h"
+#include "store/NewFile.h"
 
 namespace host {
 
@@ -178,10 +179,13 @@ void CreateSchema(Database& database) {
 
 std::unique_ptr<Database> OpenStoreFile(const std::string& path, bool forAppending) {
     CheckFileStart(path);
+    const std::string problem = forAppending ? WritingProblem(path) : "";
+    if (!problem.empty())
+        throw Error(path, "", "cannot be written: " + problem);
     std::error_code ignored;
     if (!forAppending && std::filesystem::exists(path + "-journal", ignored)) {
-        // A writer was killed while it changed the kind of its journal; only a connection that may
-        // write can take back what it left.
+        // A writer is at work or was killed; only a connection that may write can take back what it
+        // left.
         Database(path, SQLITE_OPEN_READWRITE)
             .Number("PRAGMA schema_version", "take back what a killed writer left in its -journal");
     }

@@ -212,7 +212,7 @@ TEST(StoreDamage, KilledWriterLeavesWholeGesturesAndAllThatWasReported) {
     EXPECT_TRUE(WIFSIGNALED(status));
     EXPECT_GE(ExpectWholeGestures(path), kReported);
     Store::OpenForAppending(path).Append(SmallGesture("afterwards"));
-    EXPECT_FALSE(std::filesystem::exists(path + "-wal"));
+    EXPECT_FALSE(std::filesystem::exists(path + "-journal"));
 }
 
 TEST(StoreDamage, ProcessesThatAppendAtOnceLoseNothing) {

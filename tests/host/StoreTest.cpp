@@ -241,23 +241,6 @@ TEST(StoreCreate, ExistingFileIsRefused) {
     EXPECT_EQ(Store::OpenForReading(path).Count(), 1);
 }
 
-TEST(StoreCreate, StoreAndEmptyFileAreReplacedOnDemand) {
-    const std::string path = StoreOf({SmallGesture("a")});
-    EXPECT_EQ(Store::Create(path, Store::IfExists::Replace).Count(), 0);
-    WriteText(path, "");
-    EXPECT_EQ(Store::Create(path, Store::IfExists::Replace).Count(), 0);
-    std::filesystem::remove(path);
-    EXPECT_EQ(Store::Create(path, Store::IfExists::Replace).Count(), 0);
-}
-
-TEST(StoreCreate, ForeignFileIsNeverReplaced) {
-    const std::string path = TestDirectory() + "/letter.txt";
-    WriteText(path, "Dear reader");
-    EXPECT_THAT(ErrorOf([&] { Store::Create(path, Store::IfExists::Replace); }),
-                StartsWith(path + ": will not be replaced"));
-    EXPECT_EQ(ReadBytes(path).size(), 11U);
-}
-
 TEST(StoreCreate, MissingDirectoryIsNamed) {
     const std::string path = TestDirectory() + "/none/s.db";
     EXPECT_THAT(ErrorOf([&] { Store::Create(path); }), StartsWith(path + ": cannot be created"));
