@@ -70,8 +70,8 @@ void MakeStores(const fs::path& directory) {
     fs::create_directories(directory);
     const auto make = [&](const char* name, const std::vector<host::Gesture>& gestures) {
         {
-            host::Store store =
-                host::Store::Create((directory / name).string(), host::Store::IfExists::Replace);
+            fs::remove(directory / name);
+            host::Store store = host::Store::Create((directory / name).string());
             for (const host::Gesture& gesture : gestures)
                 store.Append(gesture);
         }

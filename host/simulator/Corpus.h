@@ -7,6 +7,7 @@
 #define FPNAVI_HOST_CORPUS_H
 
 #include <cstdint>
+#include <functional>
 
 #include "recording/Recording.h"
 #include "simulator/Plan.h"
@@ -18,6 +19,19 @@ SimPlan CorpusPlan(uint64_t seed, int64_t index);
 
 // The gesture itself; its id is "sim-<seed>-<index>", the index in at least 7 digits.
 Gesture SimulateCorpusGesture(uint64_t seed, int64_t index);
+
+// Gestures first .. first + count - 1 of a seed.
+struct CorpusPart {
+    uint64_t seed = 1;
+    int64_t first = 0;
+    int64_t count = 0;
+};
+
+// Calls take with each gesture of part, in their order, in the calling thread; so many threads (0:
+// one for each processor) simulate them meanwhile. take returns false to end it. What take throws
+// ends it, too.
+void SimulateCorpus(const CorpusPart& part, int32_t threads,
+                    const std::function<bool(Gesture&&)>& take);
 
 }  // namespace host
 

@@ -137,7 +137,7 @@ Gesture Simulate(const SimPlan& plan, std::string id) {
     gesture.label = answers.label;
     gesture.accepted = std::move(answers.accepted);
     gesture.tier = std::move(answers.tier);
-    gesture.tags = {"simulated", std::move(answers.kindTag), plan.plain ? "plain" : "tiled"};
+    gesture.tags = {kSimulatedTag, std::move(answers.kindTag), plan.plain ? "plain" : "tiled"};
     if (plan.skin != SkinState::Normal)
         gesture.tags.emplace_back(plan.skin == SkinState::Wet ? "wet" : "dry");
     gesture.notes = NoteOf(plan);

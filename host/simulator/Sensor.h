@@ -10,6 +10,9 @@
 
 namespace host {
 
+// A tag of every simulated gesture and of no other.
+inline constexpr const char* kSimulatedTag = "simulated";
+
 // Grey levels, fixed pattern and noise of the sensor that plan uses.
 GreyModel GreyModelOf(const SimPlan& plan);
 

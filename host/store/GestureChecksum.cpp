@@ -1,4 +1,4 @@
-// All fields of a gesture as one row of bytes, and their CRC-32.
+// The recorded fields of a gesture as one row of bytes, and their CRC-32.
 #include "store/GestureChecksum.h"
 
 #include <zlib.h>
@@ -54,16 +54,7 @@ uint32_t GestureChecksum(const Gesture& gesture) {
         crc.Optional(frame.presence);
     }
     crc.Number(static_cast<int64_t>(gesture.end));
-    crc.Optional(gesture.label);
-    crc.Number(static_cast<int64_t>(gesture.accepted.size()));
-    for (const int32_t key : gesture.accepted)
-        crc.Number(key);
-    crc.Sequence(gesture.tier);
-    crc.Number(static_cast<int64_t>(gesture.tags.size()));
-    for (const std::string& tag : gesture.tags)
-        crc.Sequence(tag);
     crc.Sequence(gesture.libraryVersion);
-    crc.Sequence(gesture.notes);
     return crc.Get();
 }
 

@@ -46,6 +46,8 @@ int64_t Database::Number(const char* sql, const char* doing) const {
 
 void Database::Fail(const std::string& doing) const {
     std::string reason = sqlite3_errmsg(m_handle);
+    if (sqlite3_extended_errcode(m_handle) == SQLITE_READONLY_DBMOVED)
+        reason = "the file was moved, deleted or replaced meanwhile";
     const int primary = sqlite3_errcode(m_handle) & 0xFF;
     const int systemError = sqlite3_system_errno(m_handle);
     if ((primary == SQLITE_IOERR || primary == SQLITE_CANTOPEN) && systemError != 0)
@@ -82,7 +84,9 @@ void Statement::Bind(int parameter, std::string_view text) {
 }
 
 void Statement::BindBlob(int parameter, const std::vector<uint8_t>& blob) {
-    CheckBound(sqlite3_bind_blob64(m_handle, parameter, blob.data(), blob.size(), SQLITE_STATIC));
+    // A null pointer would bind NULL instead of an empty blob.
+    const void* const bytes = blob.empty() ? static_cast<const void*>("") : blob.data();
+    CheckBound(sqlite3_bind_blob64(m_handle, parameter, bytes, blob.size(), SQLITE_STATIC));
 }
 
 void Statement::BindNull(int parameter) {

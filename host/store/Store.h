@@ -40,17 +40,13 @@ struct StoreExtent {
 // file, also for appending.
 class Store {
   public:
-    enum class IfExists {
-        Fail,     // a file of that name is an error
-        Replace,  // a store (or an empty file) of that name is replaced; anything else is an error
-    };
-
-    // A new store, open for appending. A kill at any moment leaves what was there before, or the
-    // new store.
-    static Store Create(const std::string& path, IfExists ifExists = IfExists::Fail);
+    // A new store, open for appending, for its owner alone to read (0600). A file of that name is
+    // an Error (store/Replacement.h replaces one). A kill at any moment leaves nothing of that name
+    // or the new store.
+    static Store Create(const std::string& path);
 
     // An existing one. Error for a file that is missing, empty, truncated, no SQLite file, another
-    // program's database or of a newer schema. Appending brings an older schema to this one.
+    // program's database or of another schema version.
     static Store OpenForReading(const std::string& path);
     static Store OpenForAppending(const std::string& path);
 
@@ -79,6 +75,9 @@ class Store {
     };
 
     int64_t Count() const;
+
+    // Gestures that do not have this tag.
+    int64_t CountWithoutTag(const std::string& tag) const;
 
     // Error when the index of the ids has another number of gestures.
     StoreExtent Extent() const;
@@ -110,8 +109,11 @@ class Store {
     const std::string& Path() const;
 
   private:
+    friend class Replacement;
+
     Store(std::unique_ptr<Database> database, bool appending);
-    void Close() noexcept;
+    // The tables in an empty file that nobody else knows yet; nothing guards it against a kill.
+    static Store MakeNew(const std::string& path);
 
     StoreReader& Reader() const;
 

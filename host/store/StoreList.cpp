@@ -73,6 +73,16 @@ StoreExtent Store::Extent() const {
     return {rows, row.Integer(2, 0, INT64_MAX)};
 }
 
+int64_t Store::CountWithoutTag(const std::string& tag) const {
+    Statement row(*m_database,
+                  "SELECT count(*) FROM gesture WHERE NOT json_valid(tags) OR "
+                  "NOT EXISTS (SELECT 1 FROM json_each(tags) WHERE value = ?)",
+                  "count the gestures by their tags");
+    row.Bind(1, tag);
+    row.Step();
+    return row.Integer(0, 0, INT64_MAX);
+}
+
 std::vector<std::string> Store::Ids() const {
     Extent();
     Statement row(*m_database, "SELECT id FROM gesture ORDER BY seq", "list the gestures");

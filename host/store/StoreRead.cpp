@@ -20,23 +20,22 @@ constexpr int64_t kInt32Max = std::numeric_limits<int32_t>::max();
 constexpr int64_t kUint32Max = std::numeric_limits<uint32_t>::max();
 
 // The columns that GestureFromRow reads, in its order.
-#define FPNAVI_GESTURE_COLUMNS(checksum)                                                     \
+#define FPNAVI_GESTURE_COLUMNS                                                               \
     "SELECT g.seq, g.id, p.params, g.mode, g.block_width, g.block_height, g.block_col_num, " \
     "g.block_row_num, g.frame_count, g.end, g.label, g.accepted, g.tier, g.tags, "           \
-    "g.library_version, g.notes, " checksum                                                  \
-    " FROM gesture g LEFT JOIN param_block p ON p.id = g.param_block "
+    "g.library_version, g.notes, g.checksum "                                                \
+    "FROM gesture g LEFT JOIN param_block p ON p.id = g.param_block "
 
-constexpr const char* kReadOne = FPNAVI_GESTURE_COLUMNS("g.checksum") "WHERE g.id = ?";
-constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS("g.checksum") "ORDER BY g.seq";
-constexpr const char* kReadRow = FPNAVI_GESTURE_COLUMNS("g.checksum") "WHERE g.seq = ?";
-constexpr const char* kReadOneOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "WHERE g.id = ?";
-constexpr const char* kReadRowOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "WHERE g.seq = ?";
-constexpr const char* kReadAllOfVersion1 = FPNAVI_GESTURE_COLUMNS("NULL") "ORDER BY g.seq";
+constexpr const char* kReadOne = FPNAVI_GESTURE_COLUMNS "WHERE g.id = ?";
+constexpr const char* kReadRow = FPNAVI_GESTURE_COLUMNS "WHERE g.seq = ?";
+constexpr const char* kReadAll = FPNAVI_GESTURE_COLUMNS "ORDER BY g.seq";
 #undef FPNAVI_GESTURE_COLUMNS
 
 constexpr const char* kReadFrames =
-    "SELECT frame_index, raw, reg24, reg28, x16, y16, presence FROM frame WHERE gesture = ? "
+    "SELECT frame_index, reg24, reg28, x16, y16, presence FROM frame WHERE gesture = ? "
     "ORDER BY frame_index";
+
+constexpr const char* kReadPixels = "SELECT raw FROM pixels WHERE gesture = ?";
 
 std::vector<std::string> TextList(const Statement& row, int column, const char* name) {
     const nlohmann::json list = nlohmann::json::parse(row.Text(column), nullptr, false);
@@ -89,12 +88,11 @@ std::optional<int32_t> OptionalInteger(const Statement& row, int column, int64_t
 
 RecordedFrame FrameFromRow(const Statement& row) {
     RecordedFrame frame;
-    frame.raw = row.Blob(1);
-    frame.reg24 = static_cast<uint32_t>(row.Integer(2, 0, kUint32Max));
-    frame.reg28 = static_cast<uint32_t>(row.Integer(3, 0, kUint32Max));
-    frame.x16 = OptionalInteger(row, 4, kInt32Min, kInt32Max);
-    frame.y16 = OptionalInteger(row, 5, kInt32Min, kInt32Max);
-    const std::optional<int32_t> presence = OptionalInteger(row, 6, -1, 1);
+    frame.reg24 = static_cast<uint32_t>(row.Integer(1, 0, kUint32Max));
+    frame.reg28 = static_cast<uint32_t>(row.Integer(2, 0, kUint32Max));
+    frame.x16 = OptionalInteger(row, 3, kInt32Min, kInt32Max);
+    frame.y16 = OptionalInteger(row, 4, kInt32Min, kInt32Max);
+    const std::optional<int32_t> presence = OptionalInteger(row, 5, -1, 1);
     if (presence)
         frame.presence = static_cast<Presence>(*presence);
     return frame;
@@ -132,6 +130,26 @@ void ReadFrames(Statement& row, int64_t seq, int64_t count, Gesture& gesture) {
     }
 }
 
+// Gives each frame of the gesture an equal part of the pixels; CheckGesture looks at its size.
+void ReadPixels(Statement& row, int64_t seq, Gesture& gesture) {
+    const ResetAtEnd reset(row);
+    row.Bind(1, seq);
+    row.At(GesturePlace(gesture.id));
+    if (!row.Step())
+        row.FailRow("has no pixels, expected those of its frames");
+    const std::vector<uint8_t> raw = row.Blob(0);
+    const size_t count = gesture.frames.size();
+    if (count == 0 ? !raw.empty() : raw.size() % count != 0)
+        row.FailRow(fmt::format("has {} bytes of pixels, expected {} frames of equal size",
+                                raw.size(), count));
+    auto next = raw.begin();
+    for (RecordedFrame& frame : gesture.frames) {
+        const auto end = next + static_cast<std::ptrdiff_t>(raw.size() / count);
+        frame.raw.assign(next, end);
+        next = end;
+    }
+}
+
 void CheckChecksum(const Statement& row, int column, const Gesture& gesture) {
     if (row.IsNull(column))
         return;
@@ -152,10 +170,10 @@ class StoreReader {
   public:
     explicit StoreReader(const Database& database)
         : m_database(database),
-          m_sums(StoreVersion(database) > kStoreSchemaWithoutChecksums),
-          m_byId(database, m_sums ? kReadOne : kReadOneOfVersion1, "read the gesture"),
-          m_bySeq(database, m_sums ? kReadRow : kReadRowOfVersion1, "read the gesture"),
-          m_frames(database, kReadFrames, "read the frames") {}
+          m_byId(database, kReadOne, "read the gesture"),
+          m_bySeq(database, kReadRow, "read the gesture"),
+          m_frames(database, kReadFrames, "read the frames"),
+          m_pixels(database, kReadPixels, "read the pixels") {}
 
     template <typename Key>
     Gesture Read(const Key& key, const std::string& place) {
@@ -169,7 +187,7 @@ class StoreReader {
     }
 
     void ReadAll(const std::function<void(const Gesture&)>& visit) {
-        Statement row(m_database, m_sums ? kReadAll : kReadAllOfVersion1, "read the gestures");
+        Statement row(m_database, kReadAll, "read the gestures");
         while (row.Step()) {
             visit(FromRow(row));
             row.At("");
@@ -204,8 +222,9 @@ class StoreReader {
         gesture.tags = TextList(row, 13, "tags");
         gesture.libraryVersion = row.Text(14);
         gesture.notes = row.Text(15);
-        ReadFrames(m_frames, row.Integer(0, INT64_MIN, INT64_MAX), row.Integer(8, 0, kInt32Max),
-                   gesture);
+        const int64_t seq = row.Integer(0, INT64_MIN, INT64_MAX);
+        ReadFrames(m_frames, seq, row.Integer(8, 0, kInt32Max), gesture);
+        ReadPixels(m_pixels, seq, gesture);
         CheckGesture(gesture, m_database.Path());
         CheckChecksum(row, 16, gesture);
         return gesture;
@@ -214,10 +233,10 @@ class StoreReader {
     static constexpr size_t kParamsMax = 256;  // some 3 KB each
 
     const Database& m_database;
-    bool m_sums;
     Statement m_byId;
     Statement m_bySeq;
     Statement m_frames;
+    Statement m_pixels;
     std::unordered_map<std::string, ParamBlock> m_params;
 };
 
@@ -229,7 +248,6 @@ Store::Store(Store&& other) noexcept = default;
 Store& Store::operator=(Store&& other) noexcept {
     if (this != &other) {
         m_reader.reset();  // its statements end before their connection
-        Close();
         m_database = std::move(other.m_database);
         m_reader = std::move(other.m_reader);
         m_appending = other.m_appending;
@@ -237,10 +255,7 @@ Store& Store::operator=(Store&& other) noexcept {
     return *this;
 }
 
-Store::~Store() {
-    m_reader.reset();
-    Close();
-}
+Store::~Store() = default;
 
 Store Store::OpenForReading(const std::string& path) {
     return Store(OpenStoreFile(path, false), false);

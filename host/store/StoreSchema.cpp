@@ -14,13 +14,16 @@
 
 #include "common/Error.h"
 #include "parameters/ParamTable.h"
+#include "store/NewFile.h"
 
 namespace host {
 
 namespace {
 
 // Names instead of numbers wherever a person may look with a SQLite shell. A parameter block is
-// stored once for all gestures that share it. The checksum is null where nobody has made one.
+// stored once for all gestures that share it. The checksum is null where nobody has made one. The
+// pixels of a gesture are one blob: SQLite fills the pages of a long one to the last byte, while
+// rows of half a page leave much of each empty.
 constexpr const char* kTables = R"(
 CREATE TABLE param_block (
     id     INTEGER PRIMARY KEY,
@@ -48,14 +51,22 @@ CREATE TABLE gesture (
 CREATE TABLE frame (
     gesture     INTEGER NOT NULL REFERENCES gesture (seq) ON DELETE CASCADE,
     frame_index INTEGER NOT NULL CHECK (frame_index >= 0),
-    raw         BLOB NOT NULL CHECK (typeof(raw) = 'blob'),
     reg24       INTEGER NOT NULL CHECK (reg24 BETWEEN 0 AND 4294967295),
     reg28       INTEGER NOT NULL CHECK (reg28 BETWEEN 0 AND 4294967295),
     x16         INTEGER,
     y16         INTEGER,
     presence    INTEGER CHECK (presence IN (-1, 0, 1)),
     PRIMARY KEY (gesture, frame_index)
+) WITHOUT ROWID;
+CREATE TABLE pixels (
+    gesture INTEGER PRIMARY KEY REFERENCES gesture (seq) ON DELETE CASCADE,
+    raw     BLOB NOT NULL CHECK (typeof(raw) = 'blob')
 );
+CREATE VIEW frame_raw AS
+    SELECT id, gesture, frame_index,
+           substr(raw, frame_index * length(raw) / frame_count + 1, length(raw) / frame_count)
+               AS raw
+    FROM gesture JOIN frame ON frame.gesture = seq JOIN pixels USING (gesture);
 )";
 
 // The start of every SQLite file; numbers are big-endian.
@@ -128,19 +139,19 @@ void CheckIdentity(const Database& database) {
                     fmt::format("a SQLite database of another program (application id {:#x}, "
                                 "expected {:#x} of a recording store)",
                                 application, kStoreApplicationId));
-    const int64_t version = StoreVersion(database);
-    if (version < kStoreSchemaWithoutChecksums || version > kStoreSchemaVersion)
+    const int64_t version = database.Number("PRAGMA user_version", "read the schema version");
+    if (version != kStoreSchemaVersion)
         throw Error(database.Path(), "",
-                    fmt::format("schema version {}, expected {} to {}{}", version,
-                                kStoreSchemaWithoutChecksums, kStoreSchemaVersion,
+                    fmt::format("schema version {}, expected {}{}", version, kStoreSchemaVersion,
                                 version > kStoreSchemaVersion
                                     ? ": written by a newer version of this program"
                                     : ""));
     // Reading the schema shows missing tables and columns now rather than at the first gesture.
     constexpr const char* kDoing = "find the tables of a recording store";
-    for (const char* sql : {"SELECT id, params FROM param_block",
-                            "SELECT seq, id, param_block, frame_count FROM gesture",
-                            "SELECT gesture, frame_index, raw FROM frame"})
+    for (const char* sql :
+         {"SELECT id, params FROM param_block",
+          "SELECT seq, id, param_block, frame_count FROM gesture",
+          "SELECT gesture, frame_index, reg24 FROM frame", "SELECT gesture, raw FROM pixels"})
         const Statement readable(database, sql, kDoing);
 }
 
@@ -166,31 +177,15 @@ void CreateSchema(Database& database) {
     transaction.Commit();
 }
 
-int64_t StoreVersion(const Database& database) {
-    return database.Number("PRAGMA user_version", "read the schema version");
-}
-
-void UpgradeSchema(Database& database) {
-    if (StoreVersion(database) != kStoreSchemaWithoutChecksums)
-        return;
-    constexpr const char* kDoing = "add the checksums";
-    Transaction transaction(database, kDoing);
-    // Checked again within the transaction: another process may have done it meanwhile.
-    if (StoreVersion(database) == kStoreSchemaWithoutChecksums)
-        database.Execute(
-            fmt::format("ALTER TABLE gesture ADD COLUMN checksum INTEGER; PRAGMA user_version = {}",
-                        kStoreSchemaVersion)
-                .c_str(),
-            kDoing);
-    transaction.Commit();
-}
-
 std::unique_ptr<Database> OpenStoreFile(const std::string& path, bool forAppending) {
     CheckFileStart(path);
+    const std::string problem = forAppending ? WritingProblem(path) : "";
+    if (!problem.empty())
+        throw Error(path, "", "cannot be written: " + problem);
     std::error_code ignored;
     if (!forAppending && std::filesystem::exists(path + "-journal", ignored)) {
-        // A writer was killed while it changed the kind of its journal; only a connection that may
-        // write can take back what it left.
+        // A writer is at work or was killed; only a connection that may write can take back what it
+        // left.
         Database(path, SQLITE_OPEN_READWRITE)
             .Number("PRAGMA schema_version", "take back what a killed writer left in its -journal");
     }

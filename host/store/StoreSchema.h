@@ -13,22 +13,15 @@ namespace host {
 // "FNav" as SQLite's application id.
 inline constexpr int64_t kStoreApplicationId = 0x464E6176;
 
-// Grows by one with every change of the tables that an older reader cannot read. Version 1 has no
-// checksums; it is read as it is, and becomes version 2 when it is opened for appending.
-inline constexpr int64_t kStoreSchemaVersion = 2;
-inline constexpr int64_t kStoreSchemaWithoutChecksums = 1;
+// Grows by one with every change of the tables that an older reader cannot read. 3 is the first
+// that every later program opens.
+inline constexpr int64_t kStoreSchemaVersion = 3;
 
 // Longest image side in pixels, that of the library.
 inline constexpr int64_t kMaxImageSide = 4096;
 
 // Creates the tables in the new database.
 void CreateSchema(Database& database);
-
-// The schema version of a store.
-int64_t StoreVersion(const Database& database);
-
-// Brings an older store, open for writing, to this version.
-void UpgradeSchema(Database& database);
 
 // Sets up a connection for appending.
 void PrepareForAppending(Database& database);

@@ -78,42 +78,52 @@ int64_t StoreGestureRow(const Database& database, const Gesture& gesture, int64_
 
 void StoreFrames(const Database& database, const Gesture& gesture, int64_t gestureSeq) {
     Statement insert(database,
-                     "INSERT INTO frame (gesture, frame_index, raw, reg24, reg28, x16, y16, "
-                     "presence) VALUES (?, ?, ?, ?, ?, ?, ?, ?)",
+                     "INSERT INTO frame (gesture, frame_index, reg24, reg28, x16, y16, presence) "
+                     "VALUES (?, ?, ?, ?, ?, ?, ?)",
                      "store the frames");
     insert.At(GesturePlace(gesture.id));
     int64_t index = 0;
     for (const RecordedFrame& frame : gesture.frames) {
         insert.Bind(1, gestureSeq);
         insert.Bind(2, index++);
-        insert.BindBlob(3, frame.raw);
-        insert.Bind(4, frame.reg24);
-        insert.Bind(5, frame.reg28);
-        insert.BindOptional(6, frame.x16);
-        insert.BindOptional(7, frame.y16);
-        insert.BindOptional(8, frame.presence);
+        insert.Bind(3, frame.reg24);
+        insert.Bind(4, frame.reg28);
+        insert.BindOptional(5, frame.x16);
+        insert.BindOptional(6, frame.y16);
+        insert.BindOptional(7, frame.presence);
         insert.Step();
         insert.Reset();
     }
 }
 
+void StorePixels(const Database& database, const Gesture& gesture, int64_t gestureSeq) {
+    std::vector<uint8_t> raw;
+    for (const RecordedFrame& frame : gesture.frames)
+        raw.insert(raw.end(), frame.raw.begin(), frame.raw.end());
+    Statement insert(database, "INSERT INTO pixels (gesture, raw) VALUES (?, ?)",
+                     "store the pixels");
+    insert.At(GesturePlace(gesture.id));
+    insert.Bind(1, gestureSeq);
+    insert.BindBlob(2, raw);
+    insert.Step();
+}
+
 }  // namespace
 
-// Each commit is one flush of the write-ahead log; without synchronous FULL the last gestures could
-// be lost with the power. Where the log is not possible (some network file systems), SQLite keeps
-// its rollback journal, which is as safe and slower.
+// The rollback journal keeps what was in the pages that a transaction changes; gestures go behind
+// them, so that their pixels are written once. A write-ahead log would write them twice. EXTRA: a
+// commit is on the disk when it returns, also the end of its journal.
 void PrepareForAppending(Database& database) {
-    database.Execute("PRAGMA foreign_keys = ON; PRAGMA synchronous = FULL",
-                     "set up the connection");
-    sqlite3_exec(database.Handle(), "PRAGMA journal_mode = WAL", nullptr, nullptr, nullptr);
+    database.Execute(
+        "PRAGMA foreign_keys = ON; PRAGMA journal_mode = DELETE; PRAGMA synchronous = EXTRA",
+        "set up the connection");
 }
 
 Store Store::OpenForAppending(const std::string& path) {
     auto database = OpenStoreFile(path, true);
     if (sqlite3_db_readonly(database->Handle(), "main") == 1)
-        throw Error(path, "", "cannot be written, expected a file with write permission");
+        throw Error(path, "", "cannot be written");
     PrepareForAppending(*database);
-    UpgradeSchema(*database);
     return Store(std::move(database), true);
 }
 
@@ -137,17 +147,8 @@ void Store::Append(const Gesture& gesture) {
     const int64_t paramBlock = StoreParams(*m_database, gesture.params);
     const int64_t seq = StoreGestureRow(*m_database, gesture, paramBlock);
     StoreFrames(*m_database, gesture, seq);
+    StorePixels(*m_database, gesture, seq);
     transaction.Commit();
-}
-
-void Store::Close() noexcept {
-    if (m_database != nullptr && m_appending) {
-        // Brings everything back into the one file, unless another process has it open.
-        sqlite3_busy_timeout(m_database->Handle(), 0);
-        sqlite3_exec(m_database->Handle(), "PRAGMA journal_mode = DELETE", nullptr, nullptr,
-                     nullptr);
-    }
-    m_database.reset();
 }
 
 }  // namespace host

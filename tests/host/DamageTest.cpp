@@ -143,19 +143,30 @@ std::string TinyStore() {
     return path;
 }
 
-// All gestures by each way of reading, equal to what was stored or an error.
+// Equal but for what people say of a gesture, which the checksum leaves out.
+void ExpectSameRecording(const Gesture& got, const Gesture& expected) {
+    Gesture same = expected;
+    same.label = got.label;
+    same.accepted = got.accepted;
+    same.tier = got.tier;
+    same.tags = got.tags;
+    same.notes = got.notes;
+    ExpectSameGesture(got, same);
+}
+
+// All gestures by each way of reading, as they were recorded or an error.
 void ReadTinyStore(const std::string& path) {
     const std::vector<Gesture> expected = TinyGestures();
     const Store store = Store::OpenForReading(path);
     size_t count = 0;
     store.ForEach([&](const Gesture& gesture) {
         ASSERT_LT(count, expected.size());
-        ExpectSameGesture(gesture, expected[count++]);
+        ExpectSameRecording(gesture, expected[count++]);
     });
     EXPECT_EQ(count, expected.size());
     const std::vector<std::string> ids = store.Ids();
     ASSERT_EQ(ids.size(), expected.size());
-    ExpectSameGesture(store.Read(ids.back()), expected.back());
+    ExpectSameRecording(store.Read(ids.back()), expected.back());
 }
 
 // SQLite names no place in its file; the store adds what it was reading.
@@ -170,32 +181,35 @@ TEST(Damage, OfAStoreIsAlwaysToldOrHarmless) {
     EXPECT_GT(flipped.refused, flipped.tried / 4);
 }
 
-// The log that a killed writer leaves: SQLite takes what is sound of it.
-TEST(Damage, OfALogLeavesTheGesturesBeforeIt) {
-    const std::string path = MemoryDirectory() + "/s.db";
+// A writer that is killed within a transaction, when a part of it is in the file already.
+std::string KilledInATransaction() {
+    const std::string path = TinyStore();
     const pid_t child = host_test::InChild([&] {
-        Store store = Store::Create(path);
-        for (const Gesture& gesture : TinyGestures())
-            store.Append(gesture);
+        Store store = Store::OpenForAppending(path);
+        Store::Batch batch(store);
+        // More than the pages that SQLite keeps in memory.
+        for (int i = 0; i < 3000; ++i)
+            store.Append(TinyGesture("more" + std::to_string(i)));
         return raise(SIGKILL);
     });
     host_test::StatusOf(child);
+    EXPECT_GT(std::filesystem::file_size(path + "-journal"), 0U);
+    return path;
+}
+
+TEST(Damage, OfTheJournalOfAKilledWriterIsToldOrHarmless) {
+    const std::string path = KilledInATransaction();
     const Bytes main = ReadBytes(path);
-    const std::string log = path + "-wal";
-    ASSERT_TRUE(std::filesystem::exists(log));
     const auto read = [&] {
         WriteBytes(path, main);
-        std::filesystem::remove(path + "-shm");
-        const std::vector<Gesture> expected = TinyGestures();
-        size_t count = 0;
-        Store::OpenForReading(path).ForEach([&](const Gesture& gesture) {
-            ASSERT_LT(count, expected.size());
-            ExpectSameGesture(gesture, expected[count++]);
-        });
+        const Store store = Store::OpenForReading(path);
+        for (const Gesture& gesture : TinyGestures())
+            ExpectSameRecording(store.Read(gesture.id), gesture);
     };
-    const Reader reader = {"log of a killed writer", log, "", read, 211};
-    EXPECT_EQ(Cut(reader).refused, 0U);
-    EXPECT_EQ(Flip(reader).refused, 0U);
+    const Reader reader = {"journal of a killed writer", path + "-journal", "", read, 7};
+    const Tally cut = Cut(reader);
+    const Tally flipped = Flip(reader);
+    EXPECT_GT(cut.tried + flipped.tried, cut.refused + flipped.refused);
 }
 
 TEST(Damage, OfAnFngFileIsToldWithItsByteOrGivesASoundGesture) {

@@ -130,28 +130,38 @@ TEST_F(FullDisk, OfAnImportedDump) {
     EXPECT_GT(TryAllLimits(words, kFormer, true), 2);
 }
 
-// A file system of 300 kB of its own, where this process may have one.
+// A file system of 16 MB of its own, where this process may have one.
 bool EnterSmallFileSystem(const std::string& directory) {
     return (unshare(CLONE_NEWNS) == 0 || unshare(CLONE_NEWUSER | CLONE_NEWNS) == 0) &&
            mount("none", "/", nullptr, MS_REC | MS_PRIVATE, nullptr) == 0 &&
-           mount("fpnavi", directory.c_str(), "tmpfs", 0, "size=300k") == 0;
+           mount("fpnavi", directory.c_str(), "tmpfs", 0, "size=16m") == 0;
 }
 
 TEST_F(FullDisk, OfARealFileSystem) {
     constexpr int kNotAllowed = 77;
+    constexpr size_t kTooMany = 600;  // of 36 kB
     const pid_t child = host_test::InChild([&] {
         const std::string directory = host_test::MemoryDirectory();
         const std::string path = directory + "/c.db";
         if (!EnterSmallFileSystem(directory))
             return kNotAllowed;
-        const CommandEnd end = RunCommand(Synth(path, 0, 100, false));
+        const CommandEnd end = RunCommand(Synth(path, 0, kTooMany, false));
         EXPECT_EQ(end.exitCode, 3);
         EXPECT_THAT(end.err, StartsWith("fpnavi: " + path + ": cannot store the "));
         EXPECT_THAT(end.err, HasSubstr("full"));
         const size_t count = WholeGestures(path);
         EXPECT_GT(count, 0U);
-        EXPECT_LT(count, 100U);
-        WriteBytes(directory + "/filling", host_test::Bytes(300000));
+        EXPECT_LT(count, kTooMany);
+        EXPECT_THAT(end.err, HasSubstr(path + ": " + std::to_string(count) + " of 600 gestures "));
+        // A corpus that is to be replaced stays, also when there is no room for the new one.
+        Words force = Synth(path, 0, kTooMany, false);
+        force.push_back("--force");
+        const CommandEnd forced = RunCommand(force);
+        EXPECT_EQ(forced.exitCode, 3);
+        EXPECT_THAT(forced.err, HasSubstr("full"));
+        EXPECT_FALSE(fs::exists(path + "-new"));
+        EXPECT_EQ(WholeGestures(path), count);
+        WriteBytes(directory + "/filling", host_test::Bytes(16000000));
         const CommandEnd none = RunCommand(Synth(directory + "/d.db", 0, 1, false));
         EXPECT_EQ(none.exitCode, 3);
         EXPECT_THAT(none.err, StartsWith("fpnavi: " + directory + "/d.db: cannot be created"));

@@ -6,10 +6,12 @@
 #include "HostTestSupport.h"
 #include "ProcessSupport.h"
 #include "StoreTestSupport.h"
+#include "store/Replacement.h"
 #include "store/Store.h"
 
 namespace {
 
+using host::Replacement;
 using host::Store;
 using host_test::ErrorOf;
 using host_test::NumberIn;
@@ -63,19 +65,21 @@ TEST(StoreBatch, KeepsTheOthersWhenOneFails) {
     EXPECT_EQ(NumberIn(path, "SELECT count(*) FROM frame"), 3);
 }
 
-// The path of a store whose writer was killed, so that its gesture is in the log beside it.
+// The path of a store whose writer was killed within a transaction, so that its journal is there.
 std::string KilledStore() {
-    const std::string path = TestDirectory() + "/s.db";
+    const std::string path = StoreOf({SmallGesture("a")});
     host_test::StatusOf(host_test::InChild([&] {
-        Store store = Store::Create(path);
-        store.Append(SmallGesture("killed"));
+        Store store = Store::OpenForAppending(path);
+        Store::Batch batch(store);
+        for (int i = 0; i < 100; ++i)
+            store.Append(SmallGesture("killed" + std::to_string(i), 20));
         return raise(SIGKILL);
     }));
-    EXPECT_TRUE(std::filesystem::exists(path + "-wal"));
+    EXPECT_TRUE(std::filesystem::exists(path + "-journal"));
     return path;
 }
 
-TEST(StoreCreate, LogOfADeletedStoreIsNotTakenForItsOwn) {
+TEST(StoreCreate, JournalOfADeletedStoreIsNotTakenForItsOwn) {
     const std::string path = KilledStore();
     std::filesystem::remove(path);
     EXPECT_THAT(Store::Create(path).Ids(), IsEmpty());
@@ -84,7 +88,9 @@ TEST(StoreCreate, LogOfADeletedStoreIsNotTakenForItsOwn) {
 
 TEST(StoreCreate, StoreOfAKilledWriterIsReplaced) {
     const std::string path = KilledStore();
-    Store::Create(path, Store::IfExists::Replace).Append(SmallGesture("new"));
+    Replacement replacement(path, [](const Store& former) { EXPECT_EQ(former.Count(), 1); });
+    replacement.Content().Append(SmallGesture("new"));
+    replacement.TakePlace();
     EXPECT_THAT(Store::OpenForReading(path).Ids(), ElementsAre("new"));
 }
 
@@ -94,16 +100,6 @@ TEST(StoreCreate, WhatAKilledCreatorLeftIsOverwritten) {
     Store::Create(path).Append(SmallGesture("a"));
     EXPECT_THAT(Store::OpenForReading(path).Ids(), ElementsAre("a"));
     EXPECT_FALSE(std::filesystem::exists(path + "-new"));
-}
-
-TEST(StoreCreate, StoreThatIsBeingWrittenIsNotReplaced) {
-    const std::string path = StoreOf({});
-    Store writer = Store::OpenForAppending(path);
-    writer.Append(SmallGesture("a"));
-    EXPECT_THAT(ErrorOf([&] { Store::Create(path, Store::IfExists::Replace); }),
-                StartsWith(path + ": will not be replaced: another process has it open"));
-    writer.Append(SmallGesture("b"));
-    EXPECT_THAT(Store::OpenForReading(path).Ids(), ElementsAre("a", "b"));
 }
 
 TEST(StoreCreate, OnlyOneOfManyCreatorsSucceeds) {
@@ -116,8 +112,9 @@ TEST(StoreCreate, OnlyOneOfManyCreatorsSucceeds) {
                 Store::Create(path).Append(SmallGesture("g" + std::to_string(i)));
                 return 0;
             } catch (const host::Error& error) {
-                return std::string(error.what()) == path + ": cannot be created: File exists" ? 3
-                                                                                              : 1;
+                return std::string(error.what()) == path + ": cannot be created: the file exists"
+                           ? 3
+                           : 1;
             }
         }));
     int created = 0;

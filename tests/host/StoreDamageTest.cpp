@@ -64,10 +64,13 @@ TEST(StoreOpen, DatabaseOfAnotherProgramIsRefused) {
 
 TEST(StoreOpen, OtherSchemaVersionsAreRefused) {
     const std::string path = StoreOf({SmallGesture("a")});
-    RunSql(path, "PRAGMA user_version = 3");
-    EXPECT_THAT(OpenError(path), HasSubstr("version 3, expected 1 to 2: written by a newer"));
-    RunSql(path, "PRAGMA user_version = 0");
-    EXPECT_THAT(OpenError(path), HasSubstr("schema version 0, expected 1 to 2"));
+    RunSql(path, "PRAGMA user_version = 4");
+    EXPECT_THAT(OpenError(path), HasSubstr("schema version 4, expected 3: written by a newer"));
+    for (const char* version : {"0", "1", "2"}) {
+        RunSql(path, std::string("PRAGMA user_version = ") + version);
+        EXPECT_THAT(OpenError(path),
+                    HasSubstr(std::string("schema version ") + version + ", expected 3"));
+    }
 }
 
 TEST(StoreOpen, MissingTableIsRefused) {
@@ -115,9 +118,11 @@ TEST(StoreDamage, OverwrittenPagesNeverGiveAnUnsoundGesture) {
 
 TEST(StoreDamage, UnsoundRowsAreRefusedWithTheirPlace) {
     const std::pair<const char*, const char*> cases[] = {
-        {"UPDATE frame SET raw = x'00' WHERE frame_index = 1", "frame 1 has 1 bytes, expected"},
-        {"UPDATE frame SET raw = 'text' WHERE frame_index = 1",
-         "gesture 'a', frame 1: raw has the wrong type, expected a blob"},
+        {"UPDATE pixels SET raw = x'00'", "has 1 bytes of pixels, expected 3 frames"},
+        {"UPDATE pixels SET raw = zeroblob(4 * 2016)",
+         "frame 0 has 2688 bytes, expected 2016 (56 x 36)"},
+        {"UPDATE pixels SET raw = 'text'", "gesture 'a': raw has the wrong type, expected a blob"},
+        {"DELETE FROM pixels", "gesture 'a': has no pixels"},
         {"UPDATE frame SET reg24 = -1", "frame 0: reg24 is -1, expected 0 to 4294967295"},
         {"UPDATE frame SET reg28 = 4294967296", "reg28 is 4294967296"},
         {"UPDATE frame SET presence = 2", "presence is 2, expected -1 to 1"},
@@ -207,7 +212,7 @@ TEST(StoreDamage, KilledWriterLeavesWholeGesturesAndAllThatWasReported) {
     EXPECT_TRUE(WIFSIGNALED(status));
     EXPECT_GE(ExpectWholeGestures(path), kReported);
     Store::OpenForAppending(path).Append(SmallGesture("afterwards"));
-    EXPECT_FALSE(std::filesystem::exists(path + "-wal"));
+    EXPECT_FALSE(std::filesystem::exists(path + "-journal"));
 }
 
 TEST(StoreDamage, ProcessesThatAppendAtOnceLoseNothing) {

@@ -99,6 +99,17 @@ std::string Printable(const std::string& text) {
     return out;
 }
 
+std::string ShellWord(const std::string& text) {
+    constexpr const char* kPlain =
+        "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789/._-+,:@%=";
+    if (!text.empty() && text.find_first_not_of(kPlain) == std::string::npos)
+        return text;
+    std::string quoted = "'";
+    for (const char c : text)
+        quoted += c == '\'' ? std::string("'\\''") : std::string(1, c);
+    return quoted + "'";
+}
+
 void WriteError(const std::string& message) {
     std::fflush(stdout);
     fmt::print(stderr, "fpnavi: {}\n", message);

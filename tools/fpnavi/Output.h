@@ -75,6 +75,9 @@ class Table {
     std::vector<Column> m_columns;
 };
 
+// The text as a word of a shell's command line.
+std::string ShellWord(const std::string& text);
+
 // A counter on stderr, rewritten in place; silent when that is no terminal or show is false.
 class Progress {
   public:

@@ -32,11 +32,8 @@ struct Options {
 };
 
 host::ParamOverrides Overrides(const Options& options) {
-    host::ParamOverrides overrides;
-    const std::vector<host::ParamSetting> settings = ReadSettings(options.params);
-    for (const host::ParamSetting& setting : settings)
-        overrides.emplace_back(setting.index, setting.value);
-    WarnOfUnread(options.params, settings);
+    host::ParamOverrides overrides = {options.params, ReadSettings(options.params)};
+    WarnOfUnread(overrides.file, overrides.settings);
     return overrides;
 }
 
