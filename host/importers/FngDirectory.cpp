@@ -38,25 +38,34 @@ std::vector<fs::path> EntriesOf(const std::string& directory) {
     return entries;
 }
 
-// Adds the directory and those below it; seen are the directories so far, without links.
-void Collect(const std::string& path, std::set<fs::path>* seen, std::vector<FngDirectory>* found) {
-    if (!seen->insert(fs::canonical(path)).second)
-        throw Error(path, "", "is reached twice by links, expected each directory once");
-    const size_t index = found->size();
-    found->push_back({path, {}});
+// Adds the .fng files of the directory to found, and the directories in it to pending.
+void Collect(const std::string& path, std::vector<std::string>* pending,
+             std::vector<FngDirectory>* found) {
+    FngDirectory directory = {path, {}};
+    std::vector<std::string> below;
     for (const fs::path& entry : EntriesOf(path)) {
         std::error_code ignored;  // what cannot be looked at is told when it is read
         if (fs::is_directory(entry, ignored))
-            Collect(entry.string(), seen, found);
+            below.push_back(entry.string());
         else if (EqualInAnyCase(entry.extension().string(), kExtension))
-            (*found)[index].files.push_back(entry.string());
+            directory.files.push_back(entry.string());
     }
+    found->push_back(std::move(directory));
+    pending->insert(pending->end(), below.rbegin(), below.rend());
 }
 
+// The directory and those below it, each before those below itself.
 std::vector<FngDirectory> DirectoriesOf(const std::string& path) {
-    std::set<fs::path> seen;
+    std::set<fs::path> seen;  // without links
     std::vector<FngDirectory> found;
-    Collect(path, &seen, &found);
+    std::vector<std::string> pending = {path};
+    while (!pending.empty()) {
+        const std::string next = pending.back();
+        pending.pop_back();
+        if (!seen.insert(fs::canonical(next)).second)
+            throw Error(next, "", "is reached twice by links, expected each directory once");
+        Collect(next, &pending, &found);
+    }
     const bool empty = std::all_of(found.begin(), found.end(),
                                    [](const FngDirectory& d) { return d.files.empty(); });
     if (empty)

@@ -274,7 +274,8 @@ TEST(Damage, OfAParameterFileIsToldWithItsLineOrGivesParameters) {
               "# a device\ns_minDelta = 5\n\"s_fpImp\" = 0x10\n"
               "[_NAVI_range_mean]\nRANGE_LOW = 140\nRANGE_HIGH = 1_60\n");
     const auto read = [&] { host::ReadParamFile(path, host::DefaultParams()); };
-    const Reader reader = {"parameter file", path, "[0-9]+:[0-9]+: .*expected ", read};
+    const Reader reader = {"parameter file", path, "[0-9]+:[0-9]+: .*(expected |did you mean )",
+                           read};
     const Tally cut = Cut(reader);
     EXPECT_GT(cut.refused, cut.tried / 3);
     const Tally flipped = Flip(reader);
