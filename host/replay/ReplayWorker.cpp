@@ -4,6 +4,7 @@
 
 #include "common/Error.h"
 #include "recording/Keys.h"
+#include "replay/Replay.h"
 #include "replay/ReplayWire.h"
 
 namespace host {

@@ -2,7 +2,7 @@
 #ifndef FPNAVI_HOST_REPLAYWORKER_H
 #define FPNAVI_HOST_REPLAYWORKER_H
 
-#include "replay/ReplayProcess.h"
+#include "replay/ReplayJob.h"
 
 namespace host {
 

@@ -132,6 +132,19 @@ TEST(ParamFile, BandsAreReadFromDottedKeysTablesAndInlineTables) {
     }
 }
 
+TEST(ParamFile, SettingsAreWhatTheFileNamesWithTheirPlaces) {
+    const std::vector<host::ParamSetting> settings = host::ParseParamSettings(
+        "s_minDelta = 0\n[_NAVI_range_mean]\n  RANGE_HIGH = -7\n", "p.toml");
+    ASSERT_EQ(settings.size(), 2U);
+    for (const host::ParamSetting& setting : settings) {
+        const bool delta = setting.index == host::ParamIndex("s_minDelta");
+        EXPECT_TRUE(delta || setting.index == host::ParamIndex("_NAVI_range_mean.RANGE_HIGH"));
+        EXPECT_EQ(setting.value, delta ? 0 : -7);
+        EXPECT_EQ(setting.place, delta ? "1:14" : "3:16");
+    }
+    EXPECT_TRUE(host::ParseParamSettings("# none\n", "p.toml").empty());
+}
+
 TEST(ParamFile, HalfABandKeepsTheOtherHalf) {
     const ParamBlock params = ParseParams("_NAVI_range_mean.RANGE_LOW = 141\n", "p.toml");
     EXPECT_EQ(ParamValue(params, "_NAVI_range_mean.RANGE_HIGH"), 220);
