@@ -2,6 +2,7 @@
 #include "simulator/Arithmetic.h"
 
 #include <array>
+#include <cmath>
 
 namespace host {
 namespace {
@@ -47,13 +48,25 @@ int32_t SmoothStep(uint32_t t) {
     return static_cast<int32_t>(t * t * (768 - 2 * t) / 65536);
 }
 
-}  // namespace
-
-uint64_t Mix64(uint64_t key) {
-    key = (key ^ (key >> 30)) * 0xBF58476D1CE4E5B9ULL;
-    key = (key ^ (key >> 27)) * 0x94D049BB133111EBULL;
-    return key ^ (key >> 31);
+// Coordinates above 0, so that cells are found by a shift.
+uint32_t LatticeCell(int32_t x) {
+    return static_cast<uint32_t>(x + (1 << 20));
 }
+
+// value(column, row) at the corners of the cell of (x, y), interpolated.
+template <typename Value>
+int32_t Smoothed(int32_t x, int32_t y, uint32_t cellBits, Value value) {
+    const uint32_t column = LatticeCell(x) >> cellBits;
+    const uint32_t row = LatticeCell(y) >> cellBits;
+    const uint32_t inCell = (1U << cellBits) - 1;
+    const int32_t sx = SmoothStep((LatticeCell(x) & inCell) << (8 - cellBits));
+    const int32_t sy = SmoothStep((LatticeCell(y) & inCell) << (8 - cellBits));
+    const int32_t top = value(column, row) * (256 - sx) + value(column + 1, row) * sx;
+    const int32_t bottom = value(column, row + 1) * (256 - sx) + value(column + 1, row + 1) * sx;
+    return FloorDiv(top * (256 - sy) + bottom * sy, 65536);
+}
+
+}  // namespace
 
 uint64_t SimRandom::Next() {
     m_state += kGoldenStep;
@@ -117,40 +130,39 @@ uint32_t AngleOfDegrees(int32_t degrees) {
     return static_cast<uint32_t>(turn * 65536 / 360);
 }
 
+// The processor's root may be off where value has more than 53 bits or the double was rounded up to
+// a square; it is within 1 of the true one, since doubles have 53 bits and the root 31.
 uint32_t SquareRoot(uint64_t value) {
-    uint64_t root = 0;
-    uint64_t bit = 1ULL << 62;
-    while (bit > value)
-        bit >>= 2;
-    for (; bit != 0; bit >>= 2) {
-        if (value >= root + bit) {
-            value -= root + bit;
-            root = (root >> 1) + bit;
-        } else {
-            root >>= 1;
-        }
-    }
+    auto root = static_cast<uint64_t>(std::sqrt(static_cast<double>(value)));
+    while (root * root > value)
+        --root;
+    while ((root + 1) * (root + 1) <= value)
+        ++root;
     return static_cast<uint32_t>(root);
 }
 
-int32_t FloorDiv(int32_t value, int32_t divisor) {
-    const int32_t quotient = value / divisor;
-    return value % divisor < 0 ? quotient - 1 : quotient;
+int32_t LatticeNoise(uint64_t seed, int32_t x, int32_t y, uint32_t cellBits) {
+    return Smoothed(x, y, cellBits, [seed](uint32_t column, uint32_t row) {
+        return LatticeValue(seed, column, row);
+    });
 }
 
-int32_t LatticeNoise(uint64_t seed, int32_t x, int32_t y, uint32_t cellBits) {
-    const auto ux = static_cast<uint32_t>(x + (1 << 20));
-    const auto uy = static_cast<uint32_t>(y + (1 << 20));
-    const uint32_t column = ux >> cellBits;
-    const uint32_t row = uy >> cellBits;
-    const uint32_t inCell = (1U << cellBits) - 1;
-    const int32_t sx = SmoothStep((ux & inCell) << (8 - cellBits));
-    const int32_t sy = SmoothStep((uy & inCell) << (8 - cellBits));
-    const int32_t top =
-        LatticeValue(seed, column, row) * (256 - sx) + LatticeValue(seed, column + 1, row) * sx;
-    const int32_t bottom = LatticeValue(seed, column, row + 1) * (256 - sx) +
-                           LatticeValue(seed, column + 1, row + 1) * sx;
-    return FloorDiv(top * (256 - sy) + bottom * sy, 65536);
+Lattice::Lattice(uint64_t seed, int32_t reach, uint32_t cellBits)
+    : m_cellBits(cellBits),
+      m_first(LatticeCell(-reach) >> cellBits),
+      m_side((LatticeCell(reach) >> cellBits) - m_first + 2),
+      m_values(static_cast<size_t>(m_side) * m_side) {
+    size_t index = 0;
+    for (uint32_t row = m_first; row < m_first + m_side; ++row) {
+        for (uint32_t column = m_first; column < m_first + m_side; ++column)
+            m_values[index++] = static_cast<int8_t>(LatticeValue(seed, column, row));
+    }
+}
+
+int32_t Lattice::At(int32_t x, int32_t y) const {
+    return Smoothed(x, y, m_cellBits, [this](uint32_t column, uint32_t row) {
+        return int32_t{m_values[static_cast<size_t>(row - m_first) * m_side + (column - m_first)]};
+    });
 }
 
 }  // namespace host

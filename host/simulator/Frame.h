@@ -48,8 +48,25 @@ struct SkinPoint {
     uint8_t height = 0;   // of the skin, 0 valley .. 255 ridge; 0 without contact
 };
 
-// Contact, 0 .. 255, at (x16, y16) from the finger's centre.
-int32_t ContactAt(const ContactPatch& patch, int32_t pressure, int32_t x16, int32_t y16);
+// A contact patch at one pressure.
+class PressedPatch {
+  public:
+    PressedPatch(const ContactPatch& patch, int32_t pressure);
+
+    // Contact, 0 .. 255, at (x16, y16) from the finger's centre, |x16|, |y16| < 2^20.
+    int32_t At(int32_t x16, int32_t y16) const;
+
+  private:
+    // Depth in 1/16 pixel at a radius in 1/1024 of the ellipse, without the roughness of the edge.
+    int32_t SmoothDepth(int32_t radius) const { return (1024 - radius) * m_semi / 1024; }
+
+    ContactPatch m_patch;
+    int32_t m_semiX;  // half axes at this pressure
+    int32_t m_semiY;
+    int32_t m_semi;           // the smaller one
+    int64_t m_fullBelow = 0;  // square of the radius below which contact is full
+    int64_t m_noneFrom = 0;   // and from which there is none, whatever the roughness
+};
 
 // What the pixels of the window feel, row by row.
 std::vector<SkinPoint> SenseSkin(Skin& skin, const ContactPatch& patch, const FingerState& finger,

@@ -24,11 +24,12 @@ uint64_t PartSeed(const SimPlan& plan, SeedPart part) {
 // Adds the gradient of the skin that the window sees.
 void AddSeenGradient(Skin& skin, const ContactPatch& patch, const FingerState& finger,
                      const SensorWindow& window, SkinGradient& sum) {
+    const PressedPatch pressed(patch, finger.pressure);
     for (int32_t y = 0; y < window.height; y += kGradientStep) {
         for (int32_t x = 0; x < window.width; x += kGradientStep) {
             const int32_t x16 = (2 * x + 1 - window.width) * 8 - finger.x16;
             const int32_t y16 = (2 * y + 1 - window.height) * 8 - finger.y16;
-            if (ContactAt(patch, finger.pressure, x16, y16) > 127)
+            if (pressed.At(x16, y16) > 127)
                 skin.AddGradient(x16, y16, sum);
         }
     }

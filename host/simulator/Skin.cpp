@@ -13,6 +13,9 @@ constexpr int32_t kMinutiaCount = 30;            // one in about 46 x 46 pixels
 // Noise layers; each has its own lattice.
 enum NoiseLayer : size_t { kBendX, kBendY, kPhase, kAmplitude, kBlotch, kGrain, kBreak };
 
+constexpr uint32_t kCellBits[] = {6, 6, 4, 4, 3, 2, 2};  // of the layers: cells of 2^bits pixels
+constexpr int32_t kLatticeReach = 128;                   // at least kReach, whole cells of each
+
 // Atan2 of whole-pixel distances, from a table: it is needed 30 times for each cell.
 class TurnTable {
   public:
@@ -42,8 +45,8 @@ Skin::Skin(const SkinShape& shape)
       m_heights(static_cast<size_t>(kSide) * kSide, 0),
       m_known(static_cast<size_t>(kSide) * kSide, 0) {
     SimRandom random(Mix64(shape.seed ^ 0x5DEECE66DULL));
-    for (uint64_t& layerSeed : m_layerSeeds)
-        layerSeed = random.Next();
+    for (const uint32_t bits : kCellBits)
+        m_layers.emplace_back(random.Next(), kLatticeReach, bits);
     m_coreX16 = random.Range(-50, 50) * kSubPixels;
     m_coreY16 = random.Range(-50, 50) * kSubPixels;
     m_coreAxis = static_cast<uint32_t>(random.Below(65536));
@@ -76,13 +79,13 @@ int32_t Skin::CoreDistance16(int32_t x16, int32_t y16) const {
 
 uint32_t Skin::RidgePhase(int32_t x, int32_t y) const {
     // Bends of up to 10 pixels over 64.
-    const int32_t bendX = LatticeNoise(m_layerSeeds[kBendX], x, y, 6) * 5 / 4;
-    const int32_t bendY = LatticeNoise(m_layerSeeds[kBendY], x, y, 6) * 5 / 4;
+    const int32_t bendX = m_layers[kBendX].At(x, y) * 5 / 4;
+    const int32_t bendY = m_layers[kBendY].At(x, y) * 5 / 4;
     const int32_t distance = CoreDistance16(x * kSubPixels + bendX, y * kSubPixels + bendY);
     const uint32_t turnPer16 = kFullTurn / static_cast<uint32_t>(m_shape.period16);
     uint32_t phase = static_cast<uint32_t>(distance) * turnPer16;
     // A quarter turn of wander: ridges are not equally wide.
-    phase += static_cast<uint32_t>(LatticeNoise(m_layerSeeds[kPhase], x, y, 4) * 128);
+    phase += static_cast<uint32_t>(m_layers[kPhase].At(x, y) * 128);
     static const TurnTable turns;
     for (const Minutia& minutia : m_minutiae) {
         const uint32_t turn = turns.At(y - minutia.y, x - minutia.x);
@@ -94,12 +97,12 @@ uint32_t Skin::RidgePhase(int32_t x, int32_t y) const {
 int32_t Skin::ComputeHeight(int32_t x, int32_t y) const {
     int32_t height = Cos(RidgePhase(x, y)) * 180 / kSinOne;
     height = ClampTo(height, -128, 128);  // steeper flanks than a cosine has
-    const int32_t amplitude = 200 + LatticeNoise(m_layerSeeds[kAmplitude], x, y, 4) / 3;
+    const int32_t amplitude = 200 + m_layers[kAmplitude].At(x, y) / 3;
     height = height * amplitude / 256;
-    height += LatticeNoise(m_layerSeeds[kBlotch], x, y, 3) * m_blotch / 64;
-    height += LatticeNoise(m_layerSeeds[kGrain], x, y, 2) * m_grain / 64;
+    height += m_layers[kBlotch].At(x, y) * m_blotch / 64;
+    height += m_layers[kGrain].At(x, y) * m_grain / 64;
     if (m_shape.dryness > 0 && height > 0) {
-        const int32_t gap = LatticeNoise(m_layerSeeds[kBreak], x, y, 2) + 128;
+        const int32_t gap = m_layers[kBreak].At(x, y) + 128;
         height -= height * ClampTo(gap * 2 - 200, 0, 255) / 255 * m_shape.dryness / 100;
     }
     return ClampTo(height + 128, 0, 255);

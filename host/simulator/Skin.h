@@ -5,10 +5,11 @@
 #ifndef FPNAVI_HOST_SKIN_H
 #define FPNAVI_HOST_SKIN_H
 
-#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <vector>
+
+#include "simulator/Arithmetic.h"
 
 namespace host {
 
@@ -54,7 +55,7 @@ class Skin {
     int32_t CoreDistance16(int32_t x16, int32_t y16) const;
 
     SkinShape m_shape;
-    std::array<uint64_t, 7> m_layerSeeds{};  // of the noise layers
+    std::vector<Lattice> m_layers;  // of noise
     int32_t m_coreX16;
     int32_t m_coreY16;
     int32_t m_coreLength16;  // the core is a line; ridges run around it

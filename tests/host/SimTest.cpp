@@ -65,6 +65,24 @@ TEST(SimMath, SquareRootIsTheFloor) {
     }
 }
 
+// Where a double of 53 bits is rounded up to the next square.
+TEST(SimMath, SquareRootOfLargeValuesIsTheFloor) {
+    for (const uint64_t root : {94906266ULL, 134217729ULL, 2147483647ULL}) {
+        EXPECT_EQ(SquareRoot(root * root), root);
+        EXPECT_EQ(SquareRoot(root * root - 1), root - 1);
+    }
+}
+
+TEST(SimMath, LatticeIsTheNoiseFromATable) {
+    for (const uint32_t bits : {2U, 4U, 6U}) {
+        const host::Lattice lattice(77, 128, bits);
+        for (int32_t y = -128; y <= 128; y += 3) {
+            for (int32_t x = -128; x <= 128; ++x)
+                ASSERT_EQ(lattice.At(x, y), LatticeNoise(77, x, y, bits)) << x << ", " << y;
+        }
+    }
+}
+
 TEST(SimMath, FloorDivRoundsDown) {
     EXPECT_EQ(FloorDiv(7, 4), 1);
     EXPECT_EQ(FloorDiv(-1, 4), -1);
@@ -178,14 +196,14 @@ TEST(SensorWindow, PlainFramesAreContiguous) {
     EXPECT_EQ(hg.height, 48);
 }
 
-TEST(ContactAt, FullInTheMiddleNoneOutsideNoneInTheAir) {
+TEST(PressedPatch, FullInTheMiddleNoneOutsideNoneInTheAir) {
     const ContactPatch patch{800, 600, 48, 1};
-    EXPECT_EQ(ContactAt(patch, 256, 0, 0), 255);
-    EXPECT_EQ(ContactAt(patch, 256, 1000, 0), 0);
-    EXPECT_EQ(ContactAt(patch, 256, 0, -750), 0);
-    EXPECT_EQ(ContactAt(patch, 256, 700, 0), 255);
-    EXPECT_EQ(ContactAt(patch, 64, 700, 0), 0);  // a quarter of the pressure, half the axis
-    EXPECT_EQ(ContactAt(patch, 0, 0, 0), 0);
+    EXPECT_EQ(PressedPatch(patch, 256).At(0, 0), 255);
+    EXPECT_EQ(PressedPatch(patch, 256).At(1000, 0), 0);
+    EXPECT_EQ(PressedPatch(patch, 256).At(0, -750), 0);
+    EXPECT_EQ(PressedPatch(patch, 256).At(700, 0), 255);
+    EXPECT_EQ(PressedPatch(patch, 64).At(700, 0), 0);  // a quarter of the pressure, half the axis
+    EXPECT_EQ(PressedPatch(patch, 0).At(0, 0), 0);
 }
 
 // The finger moves 5 pixels right and 2 down; so does what the sensor feels.

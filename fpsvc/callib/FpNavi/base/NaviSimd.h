@@ -71,7 +71,8 @@ inline Bytes16 SpreadBits(uint64_t bits) {
     using Longs = uint64_t __attribute__((vector_size(16)));
     constexpr uint64_t kEachByte = 0x0101010101010101;
     const Longs bytes = {(bits & 0xFFU) * kEachByte, (bits >> 8 & 0xFFU) * kEachByte};
-    return (reinterpret_cast<Bytes16>(bytes) & LaneBits()) == LaneBits() ? Splat16(1) : Splat16(0);
+    const Bytes16 set = reinterpret_cast<Bytes16>(bytes) & LaneBits();
+    return Equal16(set, LaneBits()) & Splat16(1);
 }
 
 inline Sums NoSums() {

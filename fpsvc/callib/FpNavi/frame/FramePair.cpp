@@ -59,9 +59,11 @@ int64_t SumPiece(const LaidFrame& first, const LaidFrame& second, const Pairing&
             const Bytes16 finger =
                 And16(Load16(first.mask + at), Load16(second.mask + at + offset));
             const Bytes16 common = And16(finger, piece.mask[step]);
-            sums = kDiffs ? AddDiffs(sums, And16(Load16(first.grey + at), common),
-                                     And16(Load16(second.grey + at + offset), common))
-                          : AddBytes(sums, And16(common, Splat16(1)));
+            if constexpr (kDiffs)
+                sums = AddDiffs(sums, And16(Load16(first.grey + at), common),
+                                And16(Load16(second.grey + at + offset), common));
+            else
+                sums = AddBytes(sums, And16(common, Splat16(1)));
         }
         return sums;
     };
