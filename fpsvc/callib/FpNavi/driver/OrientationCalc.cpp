@@ -18,6 +18,13 @@
 namespace fpnavi {
 namespace {
 
+// Loads and pre-processes the whole image at data into s_imageCurr.
+int32_t LoadFrame(const uint8_t* data) {
+    if (ImgInit(&s_imageCurr, 0, s_imageHeight, 0, s_imageWidth, data) != 0)
+        return -1;
+    return ImgPreProcess(&s_imageCurr);
+}
+
 // The current frame becomes the previous one, unless it is the gesture's first, and data the
 // current one. Evaluates the pair.
 int32_t NextFrame(const uint8_t* data) {
@@ -27,8 +34,7 @@ int32_t NextFrame(const uint8_t* data) {
             return -1;
         ImgClear(&s_imageCurr);
     }
-    if (ImgInit(&s_imageCurr, 0, s_imageHeight, 0, s_imageWidth, data) != 0 ||
-        ImgPreProcess(&s_imageCurr) != 0)
+    if (LoadFrame(data) != 0)
         return -1;
     return first ? 0 : OrntCalcProcess();
 }
