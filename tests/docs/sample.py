@@ -43,7 +43,7 @@ def make(directory, environment):
         " block_col_num, block_row_num FROM gesture JOIN param_block p ON p.id = param_block"
         " WHERE gesture.id = ?", [_GESTURE]).fetchone()
     frames = [raw for raw, in db.execute(
-        'SELECT raw FROM frame WHERE gesture = ? ORDER BY frame_index', [sequence])]
+        'SELECT raw FROM frame_raw WHERE gesture = ? ORDER BY frame_index', [sequence])]
     db.close()
     (directory / 'dump.bin').write_bytes(b''.join(frames))
     (directory / 'device.toml').write_text(

@@ -32,7 +32,9 @@ struct Options {
 };
 
 host::ParamOverrides Overrides(const Options& options) {
-    host::ParamOverrides overrides = {options.params, ReadSettings(options.params)};
+    if (options.params.empty())
+        return {};
+    const host::ParamOverrides overrides = host::ReadOverrides(options.params);
     WarnOfUnread(overrides.file, overrides.settings);
     return overrides;
 }
