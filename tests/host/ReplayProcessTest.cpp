@@ -168,7 +168,7 @@ TEST(ReplayProcess, AGestureThatCannotBeReadIsOneResultAndTheRestIsReplayed) {
             throw host::Error("some.db", "gesture", "is damaged");
     }));
     ASSERT_THAT(Ids(results), ElementsAre("a", "b", "c"));
-    for (const size_t i : {0, 1}) {
+    for (const size_t i : {size_t{0}, size_t{1}}) {
         EXPECT_EQ(results[i].verdict, Verdict::Unreadable);
         EXPECT_THAT(results[i].errors, ElementsAre("some.db: gesture: is damaged"));
         EXPECT_EQ(results[i].mode, gestures[i].mode);
