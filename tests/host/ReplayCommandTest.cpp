@@ -18,7 +18,6 @@ using host_test::StoreOf;
 using nlohmann::json;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
-using ::testing::Not;
 using ::testing::StartsWith;
 
 struct Outcome {

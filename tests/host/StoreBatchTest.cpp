@@ -22,7 +22,6 @@ using host_test::WriteText;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
-using ::testing::StartsWith;
 
 TEST(StoreBatch, IsThereAfterItsCommit) {
     const std::string path = StoreOf({SmallGesture("a")});
