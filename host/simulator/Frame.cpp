@@ -44,7 +44,8 @@ std::vector<int32_t> PatternOf(const GreyModel& model, size_t pixels, size_t wid
         for (uint64_t column = 0; column < width; ++column) {
             if (column % 8 == 0)
                 block = level(100000 + row / 4 * 100 + column / 8);
-            pattern.push_back((columns[column] + rowLevel + block) * model.pattern / 256);
+            const int32_t off = columns[static_cast<size_t>(column)] + rowLevel + block;
+            pattern.push_back(off * model.pattern / 256);
         }
     }
     return pattern;
