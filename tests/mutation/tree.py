@@ -19,7 +19,7 @@ TARGETS = ('unit_tests', 'finger_detect_tests', 'finger_detect_tests_plain_lanes
 PLAIN = ('NaviSimd.h', 'WordLanes.h')  # have plain loops for other processors
 _PLAIN_OBJECTS = ('fpnavi_module_plain_lanes.dir', 'fpnavi_finger_detect_plain_lanes.dir')
 SANITIZE = ('-fsanitize=address,undefined', '-fno-sanitize-recover=all')
-_LEFT_OUT = {'build', 'web', 'docs', 'demo', '.git', 'node_modules', '__pycache__'}
+_LEFT_OUT = {'build', 'web', 'demo', '.git', 'node_modules', '__pycache__'}
 
 
 class Failure(Exception):
