@@ -16,7 +16,7 @@ _TESTED_IN = {
     'PlacementScores': 'FindCandidate', 'CandidateSearch': 'FindCandidate',
     'DisplacementScore': 'ImgJoint', 'PairMatch': 'ImgJoint', 'TuneMeasure': 'Tune',
     'TuneRegisters': 'Tune', 'WordLanes': 'FingerDetect', 'VoteInfoLog': 'Voting',
-    'alog_host': 'Log', 'NaviLog': 'Log',
+    'alog_host': 'Log', 'NaviLog': 'Log', 'NaviParamList': 'BeforeSetNaviParam',
 }
 # Files that the step tests do not call.
 _NO_STEPS = {'Voting', 'VotingFp', 'VotingHg', 'VoteInfoLog', 'Tune', 'TuneMeasure',

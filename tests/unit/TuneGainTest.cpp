@@ -71,6 +71,7 @@ TEST_F(GainFactor, ReferenceCodeIsHeldToTheSameRule) {
     for (const int32_t code : {0x2718, 0x2782, 0x8712, -1}) {
         Params().Set("_NAVI_GAIN_REF", code).Apply();
         EXPECT_FALSE(GainCodesUsable(0x2712)) << code;
+        EXPECT_FALSE(GainCodesUsable(static_cast<uint32_t>(code))) << "both " << code;
     }
     Params().Set("_NAVI_GAIN_REF", 0x2F12).Apply();
     EXPECT_TRUE(GainCodesUsable(0x2712));
