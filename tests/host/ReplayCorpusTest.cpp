@@ -2,7 +2,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "GestureBuilder.h"
+#include "ReplayTestSupport.h"
 #include "StoreTestSupport.h"
 #include "replay/ReplayCorpus.h"
 #include "store/Store.h"
@@ -13,37 +13,12 @@ using host::Gesture;
 using host::Mode;
 using host::ReplayResult;
 using host::Verdict;
-using host_test::GestureBuilder;
+using host_test::DoubleScan;
+using host_test::Ids;
+using host_test::Resting;
+using host_test::Right;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
-
-Gesture Right(const std::string& id) {
-    return GestureBuilder(Mode::Fp, id).Skin(0).Skin(6).Skin(12).Empty().Label(VKEY_RIGHT).Get();
-}
-
-// The map's left half, then its right half, then nothing.
-Gesture DoubleScan(const std::string& id) {
-    return GestureBuilder(Mode::DoubleScan, id)
-        .Skin(0)
-        .Registers(0xF0F0F0F0, 0xF0F0F0F0)
-        .Skin(6)
-        .Registers(0x0F0F0F0F, 0x0F0F0F0F)
-        .Empty()
-        .Label(VKEY_RIGHT)
-        .Get();
-}
-
-Gesture Resting(const std::string& id) {
-    return GestureBuilder(Mode::Fp, id).Skin(0).Skin(0).Empty().Label(VKEY_NO_MOVE).Get();
-}
-
-std::vector<std::string> Ids(const std::vector<ReplayResult>& results) {
-    std::vector<std::string> ids;
-    ids.reserve(results.size());
-    for (const ReplayResult& result : results)
-        ids.push_back(result.id);
-    return ids;
-}
 
 class ReplayCorpus : public ::testing::Test {
   protected:

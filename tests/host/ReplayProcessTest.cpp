@@ -9,8 +9,8 @@
 #include <optional>
 #include <stdexcept>
 
-#include "GestureBuilder.h"
 #include "HostTestSupport.h"
+#include "ReplayTestSupport.h"
 #include "common/Error.h"
 #include "replay/ReplayProcess.h"
 
@@ -21,38 +21,13 @@ using host::Mode;
 using host::ReplayAll;
 using host::ReplayResult;
 using host::Verdict;
-using host_test::GestureBuilder;
+using host_test::DoubleScan;
+using host_test::Ids;
+using host_test::Resting;
+using host_test::Right;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
-
-Gesture Right(const std::string& id) {
-    return GestureBuilder(Mode::Fp, id).Skin(0).Skin(6).Skin(12).Empty().Label(VKEY_RIGHT).Get();
-}
-
-// The map's left half, then its right half, then nothing.
-Gesture DoubleScan(const std::string& id) {
-    return GestureBuilder(Mode::DoubleScan, id)
-        .Skin(0)
-        .Registers(0xF0F0F0F0, 0xF0F0F0F0)
-        .Skin(6)
-        .Registers(0x0F0F0F0F, 0x0F0F0F0F)
-        .Empty()
-        .Label(VKEY_RIGHT)
-        .Get();
-}
-
-Gesture Resting(const std::string& id) {
-    return GestureBuilder(Mode::Fp, id).Skin(0).Skin(0).Empty().Label(VKEY_NO_MOVE).Get();
-}
-
-std::vector<std::string> Ids(const std::vector<ReplayResult>& results) {
-    std::vector<std::string> ids;
-    ids.reserve(results.size());
-    for (const ReplayResult& result : results)
-        ids.push_back(result.id);
-    return ids;
-}
 
 // True when condition holds in a process of its own.
 bool HoldsInChild(const std::function<bool()>& condition) {
